@@ -1,0 +1,14 @@
+# Flags for code of the project; generated code of others is compiled without them.
+add_library(quorl_flags INTERFACE)
+target_compile_options(quorl_flags INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wsign-conversion -Wshadow
+                                             -Wnon-virtual-dtor -Woverloaded-virtual -Wold-style-cast
+                                             -Wimplicit-fallthrough -Werror)
+
+if(QUORL_SANITIZE)
+  add_compile_options(-fsanitize=${QUORL_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer -O1)
+  add_link_options(-fsanitize=${QUORL_SANITIZE})
+endif()
+if(QUORL_SANITIZE MATCHES "thread")
+  # GCC warns that the thread sanitizer does not see std::atomic_thread_fence, which Asio uses.
+  add_compile_options(-Wno-tsan)
+endif()
