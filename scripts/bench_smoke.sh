@@ -1,0 +1,9 @@
+#!/usr/bin/env bash
+# Runs each bench of a folder for a moment: it must start, run every case once and end well. No figure is judged.
+set -euo pipefail
+bin=$1
+for bench in "$bin"/bench_*; do
+  [ -x "$bench" ] || continue
+  "$bench" --benchmark_min_time=0.001 >/dev/null 2>&1 || { echo "$(basename "$bench") failed" >&2; exit 1; }
+  echo "bench smoke: $(basename "$bench") runs"
+done
