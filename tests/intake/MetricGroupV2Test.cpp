@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <set>
 #include <sstream>
 #include <string>
@@ -8,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include "intake/MetricGroupV2.h"
+#include "messages/MessageTable.h"
 #include "messages/MetricCodable.h"
 
 namespace quorl {
@@ -143,6 +145,19 @@ TEST(MetricGroupV2Test, TwelveRowsNameNoClassOnPurpose) {
                                                                {78, "kCellularGsmGrrEventMeasCr"},
                                                                {79, "kCellularGsmGrrEventMeasCr"},
                                                                {80, "kCellularGsmGrrEventMeasCr"}}));
+}
+
+TEST(MetricGroupV2Test, FourRowsNameAClassWithoutSubscriptionIdSoThatNothingOfThemIsStored) {
+  std::vector<std::string> names;
+  for (const MetricGroupV2& row : MetricGroupV2::metricGroupData()) {
+    const auto message = makeMessage(row.className);
+    if (!message) continue;
+    const auto fields = message->table().fields;
+    if (std::none_of(fields.begin(), fields.end(), [](const FieldEntry& field) { return field.key == "subs_id"; }))
+      names.emplace_back(row.name);
+  }
+  EXPECT_EQ(names, (std::vector<std::string>{"Lqm State Change", "Reg Attempt", "Cellular SimHplmn",
+                                             "Cellular CsCallGwlPageRespFail"}));
 }
 
 TEST(MetricGroupV2Test, NineAttributesAreGraphable) {
