@@ -75,8 +75,12 @@ struct MessageTable {
     return index == 0 ? nullptr : &fields[index - 1];
   }
 
+  std::size_t flagWords() const { return (flagCount + 31U) / 32U; }
+
   std::string_view className;
   std::span<const FieldEntry> fields;
+  std::uint16_t flagOffset;  // of the words of presence flags, which stand in a row
+  std::uint16_t flagCount;
   std::span<const std::uint8_t> indexByTag;  // index in `fields` plus one; 0 for a tag of no field
   bool acceptsMetricIdTags;                  // the reader does not refuse tags that are metric ids
   MetricCodable* (*make)();
