@@ -5,12 +5,12 @@
 
 #include <gtest/gtest.h>
 
-#include "store/PersistanceStoreProtocol.h"
+#include "support/EmptyStore.h"
 
 namespace quorl::test {
 
 /// Fails the test that asks the store for anything but the insert and the read that the service needs.
-class StoreForRows : public PersistanceStoreProtocol {
+class StoreForRows : public EmptyStore {
  public:
   void fetchAvailableMetrics(std::int32_t, AvailableMetricsCompletion) override { ADD_FAILURE(); }
   void fetchAttributeHistory(std::string_view, std::string_view, AttributeDetailTimeFrame, MetricsCompletion) override {
