@@ -15,14 +15,14 @@
 #include "intake/MetricService.h"
 #include "intake/Payload.h"
 #include "messages/MetricDictionary.h"
-#include "support/EmptyStore.h"
+#include "support/RowsOnlyStore.h"
 #include "support/FakePlatform.h"
 #include "support/LogRecorder.h"
 
 namespace quorl::test {
 
 /// A store that keeps what it is given and completes when a test says so.
-class RecordingStore final : public EmptyStore {
+class RecordingStore final : public RowsOnlyStore {
  public:
   void insertMetric(Metric metric, WriteCompletion completion) override;
   void fetchMetricContents(std::string_view metricTech, std::string_view metricName,
