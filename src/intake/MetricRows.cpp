@@ -40,15 +40,6 @@ std::string logText(const FlattenedPairs& pairs) {
   return text + "]";
 }
 
-/// An error as log lines show an optional value.
-struct OptionalError {
-  const std::optional<SQLiteError>& error;
-};
-
-std::string logText(const OptionalError& optional) {
-  return optional.error ? fmt::format("Optional({})", logText(*optional.error)) : "nil";
-}
-
 bool holdsOnlyIntegers(const MetricDictionary& dictionary) {
   const auto& entries = dictionary.entries();
   return std::all_of(entries.begin(), entries.end(), [](const MetricEntry& entry) { return entry.value.isInteger(); });
@@ -140,7 +131,7 @@ void MetricService::insertMetricToDatabase(const MetricDictionary& dictionary, c
     PersistanceStoreProtocol::WriteCompletion completion = [row = metric](bool success,
                                                                           std::optional<SQLiteError> error) {
       if (!success) {
-        serviceLog.error("error occurred while inserting  ---> %{public}s", OptionalError{error});
+        serviceLog.error("error occurred while inserting  ---> %{public}s", error);
         return;
       }
       NotificationCenter::defaultCenter().post(notification::kNewZelkorMetric, {{notification::kMetricObjectKey, row}});
