@@ -11,12 +11,12 @@
 #include <vector>
 
 #include "base/Queue.h"
-#include "telephony/StoreForRows.h"
+#include "support/RowsOnlyStore.h"
 
 namespace quorl::test {
 
 /// A store in memory that keeps what a test wants to look at. Completions come on the main queue, as the real one's do.
-class FakeStore final : public StoreForRows {
+class FakeStore final : public RowsOnlyStore {
  public:
   struct Read {
     std::string metricTech;

@@ -16,8 +16,8 @@
 #include "hosts/simulator/TelephonySimulator.h"
 #include "shell/NotificationNames.h"
 #include "support/FakePlatform.h"
+#include "support/RowsOnlyStore.h"
 #include "telephony/HorvaneService.h"
-#include "telephony/StoreForRows.h"
 
 namespace quorl::test {
 namespace {
@@ -37,7 +37,7 @@ class KeepingFactory final : public QueueFactory {
 
 /// A store with a thread of its own, as the real one has. Reads that found nothing complete there, those that found
 /// rows on the main queue.
-class ThreadedStore final : public StoreForRows {
+class ThreadedStore final : public RowsOnlyStore {
  public:
   ThreadedStore(Queue& mainQueue, std::shared_ptr<Queue> database) : main_(mainQueue), database_(std::move(database)) {}
 
