@@ -91,7 +91,8 @@ constexpr const char* kClasses[] = {
 constexpr int kPayloadsPerClass = 32;
 constexpr std::uint64_t kSeed = 20231121;
 constexpr int kRepetitions = 9;
-constexpr double kClassMinTime = 0.02;
+constexpr int kClassRepetitions = 5;
+constexpr int kClassIterations = 2000;
 
 struct Sample {
   std::string_view className;
@@ -264,7 +265,8 @@ class MedianReporter : public benchmark::ConsoleReporter {
 
 void printRatios(const MedianReporter& reporter) {
   fmt::print("\nratio of medians, this engine to libprotobuf\n");
-  for (const char* task : {"read", "read_and_represent"}) fmt::print("  {:<42} {:.2f}\n", task, reporter.ratio(task));
+  for (const char* task : {"read", "read_and_represent"})
+    if (const double ratio = reporter.ratio(task); ratio > 0) fmt::print("  {:<42} {:.2f}\n", task, ratio);
   std::vector<std::pair<double, std::string>> classes;
   for (const char* name : kClasses)
     if (const double ratio = reporter.ratio(std::string("class/") + name); ratio > 0) classes.emplace_back(ratio, name);
@@ -298,9 +300,9 @@ int main(int argc, char** argv) {
     for (const auto& [side, task] : sides)
       benchmark::RegisterBenchmark((std::string("class/") + name + side).c_str(),
                                    [&samples, task = task](benchmark::State& state) { run(state, samples, task); })
-          ->Repetitions(3)
+          ->Repetitions(kClassRepetitions)
           ->ReportAggregatesOnly()
-          ->MinTime(kClassMinTime);
+          ->Iterations(kClassIterations);
   }
   MedianReporter reporter;
   benchmark::RunSpecifiedBenchmarks(&reporter);
