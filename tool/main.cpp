@@ -1,0 +1,51 @@
+#include <clocale>
+#include <iostream>
+#include <string>
+
+#include "Commands.h"
+
+namespace {
+
+/// The first line of what the parser says; nobody needs its hint at --help a second time.
+std::string oneLine(const std::string& text) {
+  return text.substr(0, text.find('\n'));
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  using namespace quorl::tool;
+  std::setlocale(LC_ALL, "");
+  std::ios::sync_with_stdio(false);
+  std::cin.tie(nullptr);
+
+  CLI::App tool("Decodes cellular metrics, and runs the diagnostics monitor without a phone and without a screen.",
+                "quorl-tool");
+  tool.require_subcommand(1);
+  Action chosen;
+  addReplay(tool, chosen);
+  addSummary(tool, chosen);
+  addDecode(tool, chosen);
+  addEncode(tool, chosen);
+  addCatalogue(tool, chosen);
+  addSchema(tool, chosen);
+  addMakeRecording(tool, chosen);
+
+  try {
+    tool.parse(argc, argv);
+  } catch (const CLI::CallForHelp&) {
+    std::cout << tool.help();
+    return kSuccess;
+  } catch (const CLI::ParseError& error) {
+    complain(oneLine(error.what()) + " (see quorl-tool --help)");
+    return kWrongUse;
+  }
+
+  const int exitCode = chosen();
+  std::cout.flush();
+  if (!std::cout) {
+    complain("standard output cannot be written");
+    return kFailure;
+  }
+  return exitCode;
+}
