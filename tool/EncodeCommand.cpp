@@ -45,7 +45,8 @@ void addEncode(CLI::App& tool, Action& chosen) {
   auto* command = tool.add_subcommand("encode", "Write payloads from JSON");
   command->footer(
       "The other way round from decode: reads one message a line as JSON, in the form that decode prints, and prints\n"
-      "its payload in hexadecimal. A line that is no such message is reported and left out, and makes the exit code 1.");
+      "its payload in hexadecimal. A line that is no such message is reported and left out, and makes the exit code "
+      "1.");
   auto className = std::make_shared<std::string>();
   command->add_option("--class", *className, "Message class, such as KCellularEmmContext")->required();
   command->callback([&chosen, className] { chosen = [className] { return encode(*className); }; });

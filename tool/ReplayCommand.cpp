@@ -148,8 +148,8 @@ int replay(const Options& options) {
 
   // The product has no tear-down: what is made here lives until the process ends.
   const auto log = ToolLog::install(options.isVerbose);
-  static auto* phone = new SimulatedPhone({options.device, options.documents, simulator::ResourceDirectories::ofThisProgram(
-                                                                                  QUORL_RESOURCE_DIRECTORY)});
+  static auto* phone = new SimulatedPhone(
+      {options.device, options.documents, simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)});
   static auto* application = new AppDelegate;
   static const auto* rows = new RowCounter;
   const auto start = std::chrono::steady_clock::now();
@@ -177,7 +177,8 @@ void addReplay(CLI::App& tool, Action& chosen) {
   auto* command = tool.add_subcommand("replay", "Play recordings into a database");
   command->footer(
       "Starts the product on a simulated phone, plays every event of the recordings in order, and prints one JSON\n"
-      "summary. The rows are then in metricPartV11.sqlite in the documents directory. A line of a recording that is no\n"
+      "summary. The rows are then in metricPartV11.sqlite in the documents directory. A line of a recording that is "
+      "no\n"
       "event is reported and left out, and makes the exit code 1.");
   auto options = std::make_shared<Options>();
   command->add_option("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")

@@ -84,8 +84,8 @@ void shiftToNow(std::vector<simulator::RecordedEvent>& events, Date now) {
   for (const simulator::RecordedEvent& event : events)
     if (const auto timestamp = timestampOf(event)) latest = std::max(latest.value_or(0), *timestamp);
   if (!latest) return;
-  const auto nowMs = static_cast<std::uint64_t>(
-      std::chrono::duration_cast<std::chrono::milliseconds>(now.time_since_epoch()).count());
+  const auto nowMs =
+      static_cast<std::uint64_t>(std::chrono::duration_cast<std::chrono::milliseconds>(now.time_since_epoch()).count());
   for (simulator::RecordedEvent& event : events) {
     const auto timestamp = timestampOf(event);
     if (!timestamp) continue;
