@@ -1,6 +1,9 @@
 #include <clocale>
 #include <iostream>
 #include <string>
+#include <string_view>
+
+#include <fmt/format.h>
 
 #include "Commands.h"
 
@@ -9,6 +12,15 @@ namespace {
 /// The first line of what the parser says; nobody needs its hint at --help a second time.
 std::string oneLine(const std::string& text) {
   return text.substr(0, text.find('\n'));
+}
+
+/// What is wrong with the command line, in one line.
+std::string faultText(const CLI::App& tool, const CLI::ParseError& error, int argc, char** argv) {
+  // The parser misses a subcommand before it looks at what stands in its place.
+  const std::string_view first = argc > 1 ? argv[1] : "";
+  if (tool.get_subcommands().empty() && !first.empty() && !first.starts_with('-'))
+    return fmt::format("there is no subcommand \"{}\"", first);
+  return oneLine(error.what());
 }
 
 }  // namespace
@@ -37,7 +49,7 @@ int main(int argc, char** argv) {
     std::cout << tool.help();
     return kSuccess;
   } catch (const CLI::ParseError& error) {
-    complain(oneLine(error.what()) + " (see quorl-tool --help)");
+    complain(faultText(tool, error, argc, argv) + " (see quorl-tool --help)");
     return kWrongUse;
   }
 
