@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <iostream>
 #include <iterator>
+#include <limits>
 #include <memory>
 #include <optional>
 #include <string>
@@ -25,6 +26,7 @@
 #include "base/NotificationCenter.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/SimulatedPhone.h"
+#include "hosts/simulator/TelephonyScript.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MetricCodable.h"
 #include "shell/NotificationNames.h"
@@ -34,6 +36,7 @@ namespace {
 
 using simulator::RecordedEvent;
 using simulator::SimulatedPhone;
+using simulator::TelephonyScriptStep;
 
 struct Options {
   simulator::DeviceDescription device;
@@ -41,6 +44,7 @@ struct Options {
   std::string deviceClass;
   std::string documents;
   std::vector<std::string> files;
+  std::string telephonyScript;  // empty: a phone without a SIM
   bool rebaseTime = false;
   bool isVerbose = false;
 };
@@ -78,6 +82,20 @@ bool isReadable(const RecordedEvent& event, const MetricGroupV2& row) {
   return message->isReadWhole();
 }
 
+/// The steps of a script, if there is one. Bad lines are told and counted in `faults`.
+std::optional<std::vector<TelephonyScriptStep>> readScript(const std::string& file, std::size_t& faults) {
+  if (file.empty()) return std::vector<TelephonyScriptStep>();
+  simulator::TelephonyScript script = simulator::readTelephonyScript(std::filesystem::path(file));
+  bool isReadable = true;
+  for (simulator::TelephonyScriptProblem& problem : script.problems) {
+    problem.file = file;  // as the user has named it
+    complain(logText(problem));
+    isReadable = isReadable && problem.line > 0;
+  }
+  faults += script.problems.size();
+  return isReadable ? std::optional(std::move(script.steps)) : std::nullopt;
+}
+
 /// Counts what becomes of an event by the catalogue, whatever the device then does with it.
 void countEvent(const RecordedEvent& event, Summary& summary) {
   ++summary.events;
@@ -109,19 +127,45 @@ class RowCounter {
   NotificationCenter::Observation fromTelephony_;
 };
 
-/// Plays the events in portions, so that a long recording does not pile up in front of the store. False if the
-/// baseband manager had no client for one of them.
-bool play(SimulatedPhone& phone, const std::vector<RecordedEvent>& events) {
-  constexpr std::size_t kPortion = 256;
-  bool isTaken = true;
-  for (std::size_t begin = 0; begin < events.size(); begin += kPortion) {
-    const std::size_t end = std::min(begin + kPortion, events.size());
-    for (std::size_t at = begin; at < end; ++at)
-      isTaken = phone.baseband().deliver(zelkor::kEventMetric, events[at].message()) && isTaken;
-    phone.runUntilAtRest();
+/// Plays recordings and telephony script by their times, as fast as the product takes them.
+class Player {
+ public:
+  Player(SimulatedPhone& phone, std::vector<TelephonyScriptStep> steps) : phone_(phone), steps_(std::move(steps)) {}
+
+  /// Does all steps that are due at `time`.
+  void goTo(std::chrono::milliseconds time) {
+    for (; nextStep_ < steps_.size() && steps_[nextStep_].at <= time; ++nextStep_) {
+      phone_.runUntilAtRest();
+      phone_.telephony().perform(steps_[nextStep_].event);
+    }
   }
-  return isTaken;
-}
+
+  /// False if the baseband manager had no client for one of the events.
+  bool play(const std::vector<RecordedEvent>& events) {
+    // A long recording does not pile up in front of the store.
+    constexpr std::size_t kPortion = 256;
+    bool isTaken = true;
+    for (std::size_t at = 0; at < events.size(); ++at) {
+      if (events[at].atMs) goTo(milliseconds(*events[at].atMs));
+      isTaken = phone_.baseband().deliver(zelkor::kEventMetric, events[at].message()) && isTaken;
+      if (at % kPortion == kPortion - 1) phone_.runUntilAtRest();
+    }
+    goTo(std::chrono::milliseconds::max());
+    phone_.runUntilAtRest();
+    return isTaken;
+  }
+
+ private:
+  static std::chrono::milliseconds milliseconds(std::uint64_t count) {
+    using Count = std::chrono::milliseconds::rep;
+    return std::chrono::milliseconds(std::in_range<Count>(count) ? static_cast<Count>(count)
+                                                                 : std::numeric_limits<Count>::max());
+  }
+
+  SimulatedPhone& phone_;
+  const std::vector<TelephonyScriptStep> steps_;
+  std::size_t nextStep_ = 0;
+};
 
 void print(const Summary& summary) {
   std::cout << jsonLine({{"events", summary.events},
@@ -137,6 +181,8 @@ int replay(const Options& options) {
   std::size_t faults = 0;
   auto events = readAll(options.files, faults);
   if (!events) return kFailure;
+  auto steps = readScript(options.telephonyScript, faults);
+  if (!steps) return kFailure;
   if (const auto prepared = prepareDocuments(options.documents); !prepared) {
     complain(prepared.error());
     return kFailure;
@@ -153,10 +199,12 @@ int replay(const Options& options) {
   static auto* application = new AppDelegate;
   static const auto* rows = new RowCounter;
   const auto start = std::chrono::steady_clock::now();
+  Player player(*phone, *std::move(steps));
   ApplicationLoop lifecycle(*application);
+  player.goTo(std::chrono::milliseconds(0));  // how the phone is found
   lifecycle.launch();
   phone->runUntilAtRest();
-  const bool isTaken = play(*phone, *events);
+  const bool isTaken = player.play(*events);
   lifecycle.terminate();
   phone->runUntilAtRest();
   summary.seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
@@ -189,6 +237,7 @@ void addReplay(CLI::App& tool, Action& chosen) {
   command->add_flag("--internal-build", options->device.isInternalBuild, "Be an internal build");
   command->add_flag("--carrier-build", options->device.isCarrierBuild, "Be a carrier build");
   command->add_flag("--rebase-time", options->rebaseTime, "Move the times in the payloads so that the last is now");
+  command->add_option("--telephony", options->telephonyScript, "Telephony script to play beside the recordings");
   command->add_flag("--verbose", options->isVerbose, "Show the log on standard error");
   command->add_option("FILE", options->files, "Recordings, in the order of playing")->required();
   command->callback([&chosen, options, command] {

@@ -172,7 +172,7 @@ TEST_F(Replay, PlaysSeveralFilesInTheirOrder) {
 
 TEST_F(Replay, AppliesTheRulesOfTheFamilyOfTheChipset) {
   // Aggregation of one carrier: rsrp -9250, that is -92 dBm, on an Ice device only.
-  record(3986195, "08e8071205588390017801");
+  record(3986195, "08e807120458c390017801");
   replay("ice15");
   EXPECT_EQ(rows("SELECT attribute_value FROM Metric WHERE attribute_name LIKE '%rsrp'"), Rows{"-92"});
   fs::remove_all(documents);
@@ -247,6 +247,44 @@ TEST_F(Replay, UnknownBasebandPrintsTheDialogAndEndsAsItsButtonDoes) {
   EXPECT_EQ(result.output, "");
   EXPECT_EQ(result.errorLines()[0],
             "Error Occured: Unable to get baseband information. Please try again or file a bug report. [Done]");
+}
+
+TEST_F(Replay, TelephonyScriptPlaysBesideTheRecording) {
+  record(kContext, kGoodContext);
+  const ToolResult result =
+      replay("mav20", {"--internal-build", "--telephony", sourcePath("resources/telephony/two-sims.jsonl").string()});
+  EXPECT_EQ(result.exitCode, 0) << testing::PrintToString(result);
+  EXPECT_EQ(rows("SELECT DISTINCT subs_id FROM Metric WHERE metric_tech = 'RAT' ORDER BY subs_id"), (Rows{"0", "1"}));
+  EXPECT_EQ(rows("SELECT count(*) FROM Metric WHERE metric_tech = 'LTE'"), Rows{"3"});
+  EXPECT_EQ(rows("SELECT count(*) FROM Metric"), Rows{summaryOf(result)["rowsInserted"].dump()});
+}
+
+TEST_F(Replay, StepOfTheScriptComesBeforeTheEventOfItsTime) {
+  recordLine(R"({"atMs":100,"kKeyMetricID":3986700,"kKeyPayload":"EAF4AQ=="})");
+  recordLine(R"({"atMs":200,"kKeyMetricID":3986700,"kKeyPayload":"EAJ4AQ=="})");
+  const fs::path script = directory.path() / "script.jsonl";
+  writeFile(script, R"({"atMs":0,"event":"simInserted","slot":1,"carrier":"Testnet"}
+{"atMs":200,"event":"cell","slot":1,"info":{"kHVCellMonitorTAC":513}}
+)");
+  const ToolResult result = replay("ice15", {"--telephony", script.string()});
+  EXPECT_EQ(result.exitCode, 0) << testing::PrintToString(result);
+  EXPECT_EQ(rows("SELECT attribute_value FROM Metric WHERE attribute_name IN ('reg_status', 'kHVCellMonitorTAC') "
+                 "ORDER BY Id"),
+            (Rows{"KREG_STATUS_REGISTRATION_FAILURE", "513", "KREG_STATUS_LIMITED_SERVICE"}));
+}
+
+TEST_F(Replay, BadLinesOfTheScriptAreReportedAndAMissingScriptIsAnError) {
+  record(kContext, kGoodContext);
+  const fs::path script = directory.path() / "script.jsonl";
+  const ToolResult missing = replay("ice15", {"--telephony", script.string()});
+  EXPECT_EQ(missing.exitCode, 1);
+  EXPECT_EQ(missing.errorLines().size(), 1U);
+  EXPECT_FALSE(fs::exists(documents));
+  writeFile(script, "nonsense\n");
+  const ToolResult bad = replay("ice15", {"--telephony", script.string()});
+  EXPECT_EQ(bad.exitCode, 1);
+  EXPECT_EQ(bad.errors.rfind("quorl-tool: " + script.string() + ":1: ", 0), 0U) << bad.errors;
+  EXPECT_EQ(rows("SELECT count(*) FROM Metric"), Rows{"3"});
 }
 
 TEST_F(Replay, MissingRecordingIsAnErrorBeforeAnythingIsMade) {

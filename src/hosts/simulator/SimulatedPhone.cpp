@@ -15,6 +15,7 @@ SimulatedPhone::SimulatedPhone(Options options)
       documents_(std::move(options.documents)),
       strings_(options.resources),
       alerts_(console_, mainQueue_),
+      telephony_(queues_),
       platform_{mainQueue_, *backgroundQueue_, queues_,    clock_, device_,     resources_, documents_, strings_,
                 console_,   alerts_,           analytics_, share_, pasteboard_, baseband_,  telephony_} {
   Platform::install(&platform_);

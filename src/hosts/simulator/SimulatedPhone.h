@@ -8,7 +8,7 @@
 #include "base/SerialQueue.h"
 #include "hosts/simulator/BasebandManager.h"
 #include "hosts/simulator/PhoneServices.h"
-#include "hosts/simulator/SilentTelephony.h"
+#include "hosts/simulator/TelephonySimulator.h"
 #include "hosts/simulator/TrackedQueue.h"
 #include "platform/Platform.h"
 
@@ -33,6 +33,8 @@ class SimulatedPhone {
   SimulatedPhone& operator=(const SimulatedPhone&) = delete;
 
   BasebandManager& baseband() { return baseband_; }
+  /// Has no SIM at first.
+  TelephonySimulator& telephony() { return telephony_; }
   DocumentsDirectory& documents() { return documents_; }
   Console& console() { return console_; }
   const KeptShare& share() const { return share_; }
@@ -58,7 +60,7 @@ class SimulatedPhone {
   KeptShare share_;
   KeptPasteboard pasteboard_;
   BasebandManager baseband_;
-  SilentTelephony telephony_;
+  TelephonySimulator telephony_;
   Platform platform_;
 };
 
