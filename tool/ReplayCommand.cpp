@@ -132,11 +132,12 @@ class Player {
  public:
   Player(SimulatedPhone& phone, std::vector<TelephonyScriptStep> steps) : phone_(phone), steps_(std::move(steps)) {}
 
-  /// Does all steps that are due at `time`.
+  /// Does all steps that are due at `time`, one after the other and each to its end.
   void goTo(std::chrono::milliseconds time) {
     for (; nextStep_ < steps_.size() && steps_[nextStep_].at <= time; ++nextStep_) {
       phone_.runUntilAtRest();
       phone_.telephony().perform(steps_[nextStep_].event);
+      phone_.runUntilAtRest();
     }
   }
 
@@ -150,8 +151,8 @@ class Player {
       isTaken = phone_.baseband().deliver(zelkor::kEventMetric, events[at].message()) && isTaken;
       if (at % kPortion == kPortion - 1) phone_.runUntilAtRest();
     }
-    goTo(std::chrono::milliseconds::max());
     phone_.runUntilAtRest();
+    goTo(std::chrono::milliseconds::max());
     return isTaken;
   }
 

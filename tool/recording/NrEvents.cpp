@@ -1,5 +1,5 @@
-#include "messages/classes/lte_statistics.h"
 #include "messages/classes/lte_signalling.h"
+#include "messages/classes/lte_statistics.h"
 #include "messages/classes/nr_cell.h"
 #include "messages/classes/nr_connection.h"
 #include "messages/classes/nr_dual_connectivity.h"
