@@ -1,0 +1,33 @@
+#include "hosts/simulator/SimulatedPhone.h"
+
+#include <utility>
+
+namespace quorl::simulator {
+
+SimulatedPhone::SimulatedPhone(Options options)
+    : loop_(std::make_shared<LoopQueue>("main")),
+      activity_(std::make_shared<Activity>([loop = loop_] { loop->stop(); })),
+      queues_(activity_),
+      mainQueue_(loop_, activity_),
+      backgroundQueue_(queues_.makeSerialQueue("background")),
+      device_(std::move(options.device)),
+      resources_(options.resources),
+      documents_(std::move(options.documents)),
+      strings_(options.resources),
+      alerts_(console_, mainQueue_),
+      telephony_(queues_),
+      platform_{mainQueue_, *backgroundQueue_, queues_,    clock_, device_,     resources_, documents_, strings_,
+                console_,   alerts_,           analytics_, share_, pasteboard_, baseband_,  telephony_} {
+  Platform::install(&platform_);
+}
+
+SimulatedPhone::~SimulatedPhone() {
+  Platform::install(nullptr);
+}
+
+void SimulatedPhone::runUntilAtRest() {
+  // Coming to rest stops the loop. A stop that comes between two rounds ends the next one early, hence the question.
+  while (!activity_->isAtRest()) loop_->run();
+}
+
+}  // namespace quorl::simulator

@@ -1,0 +1,67 @@
+#pragma once
+
+#include <filesystem>
+#include <memory>
+#include <vector>
+
+#include "base/Clock.h"
+#include "base/SerialQueue.h"
+#include "hosts/simulator/BasebandManager.h"
+#include "hosts/simulator/PhoneServices.h"
+#include "hosts/simulator/TelephonySimulator.h"
+#include "hosts/simulator/TrackedQueue.h"
+#include "platform/Platform.h"
+
+namespace quorl::simulator {
+
+/// A phone that exists only in software and has no screen: every service of a platform, on real threads and the
+/// system's clock. The thread that makes it is its main thread, and the main queue runs only inside `runUntilAtRest`.
+///
+/// The product's process-wide objects refer to it, so it has to outlive all of them; a program keeps it to its end.
+class SimulatedPhone {
+ public:
+  struct Options {
+    DeviceDescription device;
+    std::filesystem::path documents;
+    std::vector<std::filesystem::path> resources;
+  };
+
+  /// Installs itself as the process's platform.
+  explicit SimulatedPhone(Options options);
+  ~SimulatedPhone();
+  SimulatedPhone(const SimulatedPhone&) = delete;
+  SimulatedPhone& operator=(const SimulatedPhone&) = delete;
+
+  BasebandManager& baseband() { return baseband_; }
+  /// Has no SIM at first.
+  TelephonySimulator& telephony() { return telephony_; }
+  DocumentsDirectory& documents() { return documents_; }
+  Console& console() { return console_; }
+  const KeptShare& share() const { return share_; }
+
+  /// Runs the main queue until no queue of the phone has anything left to do now. Work that waits for its time is not
+  /// waited for.
+  void runUntilAtRest();
+
+ private:
+  std::shared_ptr<LoopQueue> loop_;
+  std::shared_ptr<Activity> activity_;
+  TrackedQueueFactory queues_;
+  TrackedQueue mainQueue_;
+  std::shared_ptr<Queue> backgroundQueue_;
+  SystemClock clock_;
+  DescribedDevice device_;
+  ResourceDirectories resources_;
+  FixedDocumentsDirectory documents_;
+  GettextStrings strings_;
+  StandardErrorConsole console_;
+  PrintedAlerts alerts_;
+  LoggedAnalytics analytics_;
+  KeptShare share_;
+  KeptPasteboard pasteboard_;
+  BasebandManager baseband_;
+  TelephonySimulator telephony_;
+  Platform platform_;
+};
+
+}  // namespace quorl::simulator

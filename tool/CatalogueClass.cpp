@@ -1,0 +1,11 @@
+#include "CatalogueClass.h"
+
+namespace quorl::tool {
+
+std::string_view decodingClass(const MetricGroupV2& row) {
+  if (row.zelkorId == 806743) return "CellularLteConnectionStats";
+  if (row.zelkorId == 827746) return "CellularRatLacSrvInfo";
+  return row.className;
+}
+
+}  // namespace quorl::tool

@@ -1,0 +1,39 @@
+#include <iostream>
+#include <string>
+
+#include <fmt/format.h>
+
+#include "CatalogueClass.h"
+#include "Commands.h"
+#include "MessageJson.h"
+#include "intake/MetricGroupV2.h"
+#include "messages/MetricCodable.h"
+
+namespace quorl::tool {
+namespace {
+
+int printCatalogue() {
+  for (const MetricGroupV2& row : MetricGroupV2::metricGroupData()) {
+    const Json line = {{"tech", row.tech},
+                       {"name", row.name},
+                       {"zelkorId", row.zelkorId},
+                       {"hex", fmt::format("{:2X}", row.zelkorId)},
+                       {"className", row.className},
+                       {"deviceType", row.deviceType},
+                       {"decodable", makeMessage(decodingClass(row)) != nullptr}};
+    std::cout << jsonLine(line) << '\n';
+  }
+  return kSuccess;
+}
+
+}  // namespace
+
+void addCatalogue(CLI::App& tool, Action& chosen) {
+  auto* command = tool.add_subcommand("catalogue", "Print the metrics that can be decoded");
+  command->footer(
+      "Prints the rows of the metric catalogue in their order, one JSON object a line. \"decodable\" says whether\n"
+      "metrics of the row's id can be decoded; some rows name a class that does not exist.");
+  command->callback([&chosen] { chosen = printCatalogue; });
+}
+
+}  // namespace quorl::tool

@@ -1,0 +1,48 @@
+#include <iostream>
+#include <memory>
+#include <string>
+
+#include <fmt/format.h>
+
+#include "Commands.h"
+#include "Hexadecimal.h"
+#include "MessageClass.h"
+#include "MessageJson.h"
+
+namespace quorl::tool {
+namespace {
+
+int decode(const std::string& className) {
+  const MessageTable* table = messageClass(className);
+  if (table == nullptr) return kWrongUse;
+  int exitCode = kSuccess;
+  std::string line;
+  for (std::size_t number = 1; std::getline(std::cin, line); ++number) {
+    Json result;  // null
+    if (const auto payload = hexBytes(line)) {
+      const std::unique_ptr<MetricCodable> message(table->make());
+      message->initWithData(ByteString(*payload));
+      if (const auto dictionary = message->dictionaryRepresentation()) result = toJson(*dictionary);
+    } else {
+      complain(fmt::format("line {}: not hexadecimal", number));
+      exitCode = kFailure;
+    }
+    std::cout << jsonLine(result) << '\n';
+  }
+  return exitCode;
+}
+
+}  // namespace
+
+void addDecode(CLI::App& tool, Action& chosen) {
+  auto* command = tool.add_subcommand("decode", "Read payloads and print them as JSON");
+  command->footer(
+      "Reads one payload a line in hexadecimal from standard input and prints a line for each: the metric dictionary,\n"
+      "or null when the payload cannot be read whole. A line that is not hexadecimal prints null too, is reported,\n"
+      "and makes the exit code 1.");
+  auto className = std::make_shared<std::string>();
+  command->add_option("--class", *className, "Message class, such as KCellularEmmContext")->required();
+  command->callback([&chosen, className] { chosen = [className] { return decode(*className); }; });
+}
+
+}  // namespace quorl::tool

@@ -1,0 +1,34 @@
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include <tl/expected.hpp>
+
+// What the tool itself does with the database file that the store leaves in a documents directory.
+
+namespace quorl::tool {
+
+std::filesystem::path databaseFile(const std::filesystem::path& documents);
+
+/// Makes the directory if it is missing, and finds out whether a store can live there. The store itself ends the
+/// process when it cannot.
+tl::expected<void, std::string> prepareDocuments(const std::filesystem::path& documents);
+
+/// Writes everything that is still in the write-ahead log into the database file, so that the file alone is whole.
+tl::expected<void, std::string> foldWriteAheadLog(const std::filesystem::path& documents);
+
+/// What a store holds of one metric.
+struct MetricSummary {
+  std::string tech;
+  std::string name;
+  std::int64_t rows = 0;
+  std::string lastSeen;  // wall-clock time, as stored
+};
+
+/// By technology, then by metric.
+tl::expected<std::vector<MetricSummary>, std::string> summarize(const std::filesystem::path& documents);
+
+}  // namespace quorl::tool

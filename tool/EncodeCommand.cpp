@@ -1,0 +1,55 @@
+#include <iostream>
+#include <memory>
+#include <string>
+
+#include <fmt/format.h>
+
+#include "Commands.h"
+#include "Hexadecimal.h"
+#include "MessageClass.h"
+#include "MessageJson.h"
+#include "messages/wire/WireWriter.h"
+
+namespace quorl::tool {
+namespace {
+
+tl::expected<std::string, std::string> encodeLine(const MessageTable& table, const std::string& line) {
+  const Json object = Json::parse(line, nullptr, /*allow_exceptions=*/false);
+  if (object.is_discarded()) return tl::unexpected(std::string("not JSON"));
+  const std::unique_ptr<MetricCodable> message(table.make());
+  if (auto filled = fillFromJson(*message, object); !filled) return tl::unexpected(std::move(filled.error()));
+  WireWriter writer;
+  message->writeTo(writer);
+  return hexText(writer.bytes());
+}
+
+int encode(const std::string& className) {
+  const MessageTable* table = messageClass(className);
+  if (table == nullptr) return kWrongUse;
+  int exitCode = kSuccess;
+  std::string line;
+  for (std::size_t number = 1; std::getline(std::cin, line); ++number) {
+    if (const auto payload = encodeLine(*table, line)) {
+      std::cout << *payload << '\n';
+    } else {
+      complain(fmt::format("line {}: {}", number, payload.error()));
+      exitCode = kFailure;
+    }
+  }
+  return exitCode;
+}
+
+}  // namespace
+
+void addEncode(CLI::App& tool, Action& chosen) {
+  auto* command = tool.add_subcommand("encode", "Write payloads from JSON");
+  command->footer(
+      "The other way round from decode: reads one message a line as JSON, in the form that decode prints, and prints\n"
+      "its payload in hexadecimal. A line that is no such message is reported and left out, and makes the exit code "
+      "1.");
+  auto className = std::make_shared<std::string>();
+  command->add_option("--class", *className, "Message class, such as KCellularEmmContext")->required();
+  command->callback([&chosen, className] { chosen = [className] { return encode(*className); }; });
+}
+
+}  // namespace quorl::tool

@@ -1,0 +1,43 @@
+#include <fstream>
+#include <memory>
+#include <string>
+
+#include <fmt/format.h>
+
+#include "Commands.h"
+#include "hosts/simulator/Recording.h"
+#include "recording/RecordingMaker.h"
+
+namespace quorl::tool {
+namespace {
+
+struct Options {
+  std::string family;
+  std::string output;
+  std::uint64_t seed = 1;
+};
+
+int writeRecording(const Options& options) {
+  std::ofstream output(options.output, std::ios::binary);
+  const BasebandFamily family = options.family == "ice" ? BasebandFamily::Ice : BasebandFamily::Mav;
+  for (const simulator::RecordedEvent& event : makeRecording(family, options.seed))
+    output << simulator::recordingLine(event) << '\n';
+  if (output.flush()) return kSuccess;
+  complain(fmt::format("{}: cannot be written", options.output));
+  return kFailure;
+}
+
+}  // namespace
+
+void addMakeRecording(CLI::App& tool, Action& chosen) {
+  auto* command = tool.add_subcommand("make-recording", "Make a recording of invented events");
+  command->footer("The recordings that ship with the project are made by it. The same seed gives the same recording.");
+  command->group("");  // of no use but to the project itself
+  auto options = std::make_shared<Options>();
+  command->add_option("--family", options->family, "Baseband family")->required()->check(CLI::IsMember({"mav", "ice"}));
+  command->add_option("--seed", options->seed, "Where the invention starts")->capture_default_str();
+  command->add_option("--output", options->output, "File to write")->required();
+  command->callback([&chosen, options] { chosen = [options] { return writeRecording(*options); }; });
+}
+
+}  // namespace quorl::tool

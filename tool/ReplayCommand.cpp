@@ -1,0 +1,251 @@
+#include <algorithm>
+#include <atomic>
+#include <chrono>
+#include <cmath>
+#include <cstdint>
+#include <filesystem>
+#include <iostream>
+#include <iterator>
+#include <limits>
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <fmt/format.h>
+
+#include "CatalogueClass.h"
+#include "Commands.h"
+#include "Documents.h"
+#include "MessageJson.h"
+#include "TimeShift.h"
+#include "ToolLog.h"
+#include "app/AppDelegate.h"
+#include "app/ApplicationLoop.h"
+#include "base/NotificationCenter.h"
+#include "hosts/simulator/Recording.h"
+#include "hosts/simulator/SimulatedPhone.h"
+#include "hosts/simulator/TelephonyScript.h"
+#include "intake/MetricGroupV2.h"
+#include "messages/MetricCodable.h"
+#include "shell/NotificationNames.h"
+
+namespace quorl::tool {
+namespace {
+
+using simulator::RecordedEvent;
+using simulator::SimulatedPhone;
+using simulator::TelephonyScriptStep;
+
+struct Options {
+  simulator::DeviceDescription device;
+  std::string chipset;
+  std::string deviceClass;
+  std::string documents;
+  std::vector<std::string> files;
+  std::string telephonyScript;  // empty: a phone without a SIM
+  bool rebaseTime = false;
+  bool isVerbose = false;
+};
+
+struct Summary {
+  std::uint64_t events = 0;
+  std::uint64_t eventsWithoutRow = 0;
+  std::uint64_t unreadablePayloads = 0;
+  std::uint64_t rowsInserted = 0;
+  std::uint64_t insertsFailed = 0;
+  double seconds = 0;
+};
+
+/// All events of the files in order. Bad lines are told and counted in `faults`; a file that cannot be read ends it.
+std::optional<std::vector<RecordedEvent>> readAll(const std::vector<std::string>& files, std::size_t& faults) {
+  std::vector<RecordedEvent> events;
+  for (const std::string& file : files) {
+    auto recording = simulator::readRecording(std::filesystem::path(file));
+    if (!recording) {
+      complain(fmt::format("{}: {}", file, recording.error()));
+      return std::nullopt;
+    }
+    for (const simulator::RecordingFault& fault : recording->faults)
+      complain(fmt::format("{}:{}: {}", file, fault.line, fault.reason));
+    faults += recording->faults.size();
+    std::move(recording->events.begin(), recording->events.end(), std::back_inserter(events));
+  }
+  return events;
+}
+
+bool isReadable(const RecordedEvent& event, const MetricGroupV2& row) {
+  const auto message = makeMessage(decodingClass(row));
+  if (!message) return false;
+  message->initWithData(event.payload);
+  return message->isReadWhole();
+}
+
+/// The steps of a script, if there is one. Bad lines are told and counted in `faults`.
+std::optional<std::vector<TelephonyScriptStep>> readScript(const std::string& file, std::size_t& faults) {
+  if (file.empty()) return std::vector<TelephonyScriptStep>();
+  simulator::TelephonyScript script = simulator::readTelephonyScript(std::filesystem::path(file));
+  bool isReadable = true;
+  for (simulator::TelephonyScriptProblem& problem : script.problems) {
+    problem.file = file;  // as the user has named it
+    complain(logText(problem));
+    isReadable = isReadable && problem.line > 0;
+  }
+  faults += script.problems.size();
+  return isReadable ? std::optional(std::move(script.steps)) : std::nullopt;
+}
+
+/// Counts what becomes of an event by the catalogue, whatever the device then does with it.
+void countEvent(const RecordedEvent& event, Summary& summary) {
+  ++summary.events;
+  bool hasRow = false;
+  bool isReadableOnAllRows = true;
+  for (const MetricGroupV2& row : MetricGroupV2::metricGroupData()) {
+    if (event.metricID != row.zelkorId) continue;
+    hasRow = true;
+    isReadableOnAllRows = isReadableOnAllRows && isReadable(event, row);
+  }
+  if (!hasRow) ++summary.eventsWithoutRow;
+  if (!isReadableOnAllRows) ++summary.unreadablePayloads;
+}
+
+/// Counts the rows that reach the store, from either source.
+class RowCounter {
+ public:
+  RowCounter()
+      : fromChannel_(observe(notification::kNewZelkorMetric)), fromTelephony_(observe(notification::kNewHVMetric)) {}
+  std::uint64_t count() const { return rows_.load(); }
+
+ private:
+  NotificationCenter::Observation observe(const char* name) {
+    return NotificationCenter::defaultCenter().observe(name, [this](const Notification&) { ++rows_; });
+  }
+
+  std::atomic<std::uint64_t> rows_{0};
+  NotificationCenter::Observation fromChannel_;
+  NotificationCenter::Observation fromTelephony_;
+};
+
+/// Plays recordings and telephony script by their times, as fast as the product takes them.
+class Player {
+ public:
+  Player(SimulatedPhone& phone, std::vector<TelephonyScriptStep> steps) : phone_(phone), steps_(std::move(steps)) {}
+
+  /// Does all steps that are due at `time`, one after the other and each to its end.
+  void goTo(std::chrono::milliseconds time) {
+    for (; nextStep_ < steps_.size() && steps_[nextStep_].at <= time; ++nextStep_) {
+      phone_.runUntilAtRest();
+      phone_.telephony().perform(steps_[nextStep_].event);
+      phone_.runUntilAtRest();
+    }
+  }
+
+  /// False if the baseband manager had no client for one of the events.
+  bool play(const std::vector<RecordedEvent>& events) {
+    // A long recording does not pile up in front of the store.
+    constexpr std::size_t kPortion = 256;
+    bool isTaken = true;
+    for (std::size_t at = 0; at < events.size(); ++at) {
+      if (events[at].atMs) goTo(milliseconds(*events[at].atMs));
+      isTaken = phone_.baseband().deliver(zelkor::kEventMetric, events[at].message()) && isTaken;
+      if (at % kPortion == kPortion - 1) phone_.runUntilAtRest();
+    }
+    phone_.runUntilAtRest();
+    goTo(std::chrono::milliseconds::max());
+    return isTaken;
+  }
+
+ private:
+  static std::chrono::milliseconds milliseconds(std::uint64_t count) {
+    using Count = std::chrono::milliseconds::rep;
+    return std::chrono::milliseconds(std::in_range<Count>(count) ? static_cast<Count>(count)
+                                                                 : std::numeric_limits<Count>::max());
+  }
+
+  SimulatedPhone& phone_;
+  const std::vector<TelephonyScriptStep> steps_;
+  std::size_t nextStep_ = 0;
+};
+
+void print(const Summary& summary) {
+  std::cout << jsonLine({{"events", summary.events},
+                         {"eventsWithoutRow", summary.eventsWithoutRow},
+                         {"unreadablePayloads", summary.unreadablePayloads},
+                         {"rowsInserted", summary.rowsInserted},
+                         {"insertsFailed", summary.insertsFailed},
+                         {"seconds", std::round(summary.seconds * 1000) / 1000}})
+            << '\n';
+}
+
+int replay(const Options& options) {
+  std::size_t faults = 0;
+  auto events = readAll(options.files, faults);
+  if (!events) return kFailure;
+  auto steps = readScript(options.telephonyScript, faults);
+  if (!steps) return kFailure;
+  if (const auto prepared = prepareDocuments(options.documents); !prepared) {
+    complain(prepared.error());
+    return kFailure;
+  }
+  if (options.rebaseTime) shiftToNow(*events, SystemClock().now());
+
+  Summary summary;
+  for (const RecordedEvent& event : *events) countEvent(event, summary);
+
+  // The product has no tear-down: what is made here lives until the process ends.
+  const auto log = ToolLog::install(options.isVerbose);
+  static auto* phone = new SimulatedPhone(
+      {options.device, options.documents, simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)});
+  static auto* application = new AppDelegate;
+  static const auto* rows = new RowCounter;
+  const auto start = std::chrono::steady_clock::now();
+  Player player(*phone, *std::move(steps));
+  ApplicationLoop lifecycle(*application);
+  player.goTo(std::chrono::milliseconds(0));  // how the phone is found
+  lifecycle.launch();
+  phone->runUntilAtRest();
+  const bool isTaken = player.play(*events);
+  lifecycle.terminate();
+  phone->runUntilAtRest();
+  summary.seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+  summary.rowsInserted = rows->count();
+  summary.insertsFailed = log->failedInserts();
+  installLogSink(nullptr);
+
+  print(summary);
+  if (!isTaken) complain("the baseband manager had no configuration; is the resource deviceconfig missing?");
+  const auto folded = foldWriteAheadLog(options.documents);
+  if (!folded) complain(folded.error());
+  return faults == 0 && isTaken && folded && summary.insertsFailed == 0 ? kSuccess : kFailure;
+}
+
+}  // namespace
+
+void addReplay(CLI::App& tool, Action& chosen) {
+  auto* command = tool.add_subcommand("replay", "Play recordings into a database");
+  command->footer(
+      "Starts the product on a simulated phone, plays every event of the recordings in order, and prints one JSON\n"
+      "summary. The rows are then in metricPartV11.sqlite in the documents directory. A line of a recording that is "
+      "no\n"
+      "event is reported and left out, and makes the exit code 1.");
+  auto options = std::make_shared<Options>();
+  command->add_option("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")
+      ->required();
+  command->add_option("--documents", options->documents, "Directory for the database; made if it is missing")
+      ->required();
+  command->add_option("--device-class", options->deviceClass, "Device class, such as Tabrin");
+  command->add_flag("--internal-build", options->device.isInternalBuild, "Be an internal build");
+  command->add_flag("--carrier-build", options->device.isCarrierBuild, "Be a carrier build");
+  command->add_flag("--rebase-time", options->rebaseTime, "Move the times in the payloads so that the last is now");
+  command->add_option("--telephony", options->telephonyScript, "Telephony script to play beside the recordings");
+  command->add_flag("--verbose", options->isVerbose, "Show the log on standard error");
+  command->add_option("FILE", options->files, "Recordings, in the order of playing")->required();
+  command->callback([&chosen, options, command] {
+    options->device.chipset = options->chipset;
+    if (command->count("--device-class") > 0) options->device.deviceClass = options->deviceClass;
+    chosen = [options] { return replay(*options); };
+  });
+}
+
+}  // namespace quorl::tool

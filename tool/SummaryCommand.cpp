@@ -1,0 +1,68 @@
+#include <algorithm>
+#include <iostream>
+#include <memory>
+#include <string>
+
+#include <fmt/format.h>
+
+#include "Commands.h"
+#include "Documents.h"
+#include "MessageJson.h"
+
+namespace quorl::tool {
+namespace {
+
+struct Options {
+  std::string documents;
+  bool asJson = false;
+};
+
+void printTable(const std::vector<MetricSummary>& metrics) {
+  const MetricSummary head{"Technology", "Metric", 0, "Last seen"};
+  std::size_t techWidth = head.tech.size();
+  std::size_t nameWidth = head.name.size();
+  std::size_t rowsWidth = std::string_view("Rows").size();
+  for (const MetricSummary& metric : metrics) {
+    techWidth = std::max(techWidth, metric.tech.size());
+    nameWidth = std::max(nameWidth, metric.name.size());
+    rowsWidth = std::max(rowsWidth, std::to_string(metric.rows).size());
+  }
+  const auto print = [&](const MetricSummary& metric, const std::string& rows) {
+    std::cout << fmt::format("{:<{}}  {:<{}}  {:>{}}  {}\n", metric.tech, techWidth, metric.name, nameWidth, rows,
+                             rowsWidth, metric.lastSeen);
+  };
+  print(head, "Rows");
+  for (const MetricSummary& metric : metrics) print(metric, std::to_string(metric.rows));
+}
+
+void printJson(const std::vector<MetricSummary>& metrics) {
+  for (const MetricSummary& metric : metrics)
+    std::cout << jsonLine({{"tech", metric.tech},
+                           {"name", metric.name},
+                           {"rows", metric.rows},
+                           {"lastSeen", metric.lastSeen}})
+              << '\n';
+}
+
+int printSummary(const Options& options) {
+  const auto metrics = summarize(options.documents);
+  if (!metrics) {
+    complain(metrics.error());
+    return kFailure;
+  }
+  options.asJson ? printJson(*metrics) : printTable(*metrics);
+  return kSuccess;
+}
+
+}  // namespace
+
+void addSummary(CLI::App& tool, Action& chosen) {
+  auto* command = tool.add_subcommand("summary", "Print what a database holds, metric by metric");
+  command->footer("One line for each metric: technology, metric, rows, and the time of the latest row.");
+  auto options = std::make_shared<Options>();
+  command->add_option("--documents", options->documents, "Documents directory that replay filled")->required();
+  command->add_flag("--json", options->asJson, "Print one JSON object a line instead of a table");
+  command->callback([&chosen, options] { chosen = [options] { return printSummary(*options); }; });
+}
+
+}  // namespace quorl::tool
