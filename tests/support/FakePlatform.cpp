@@ -32,9 +32,19 @@ std::string FakeStrings::localized(std::string_view key) {
   return found == table.end() ? std::string(key) : found->second;
 }
 
+void FakeAnalytics::send(std::string_view event, const Payload& payload) {
+  if (onSend) onSend(event);
+  sent.emplace_back(event, payload);
+}
+
+void FakeAlerts::present(Alert alert) {
+  if (onPresent) onPresent(alert);
+  shown.push_back(std::move(alert));
+}
+
 std::shared_ptr<zelkor::client::Manager> FakeZelkor::CreateManager(std::string_view name,
                                                                    std::shared_ptr<Queue> deliveryQueue) {
-  calls.emplace_back("CreateManager");
+  record("CreateManager");
   clientName = std::string(name);
   queue = std::move(deliveryQueue);
   return std::make_shared<zelkor::client::Manager>();
@@ -42,25 +52,30 @@ std::shared_ptr<zelkor::client::Manager> FakeZelkor::CreateManager(std::string_v
 
 void FakeZelkor::RegisterEventHandler(const std::shared_ptr<zelkor::client::Manager>& /*manager*/,
                                       std::string_view event, zelkor::client::EventHandler handler) {
-  calls.push_back("RegisterEventHandler " + std::string(event));
+  record("RegisterEventHandler " + std::string(event));
   handlers_.insert_or_assign(std::string(event), std::move(handler));
 }
 
 void FakeZelkor::EventsOff(const std::shared_ptr<zelkor::client::Manager>& /*manager*/) {
-  calls.emplace_back("EventsOff");
+  record("EventsOff");
 }
 
 void FakeZelkor::EventsOn(const std::shared_ptr<zelkor::client::Manager>& /*manager*/) {
-  calls.emplace_back("EventsOn");
+  record("EventsOn");
 }
 
 zelkor::client::Result FakeZelkor::PerformCommand(const std::shared_ptr<zelkor::client::Manager>& /*manager*/,
                                                   std::string_view command, const zelkor::KeyValueMessage& message,
                                                   zelkor::KeyValueMessage& /*response*/) {
-  calls.emplace_back(command);
+  record(std::string(command));
   commands.push_back({std::string(command), message});
   const auto found = answers.find(command);
   return found == answers.end() ? zelkor::client::Result{} : found->second;
+}
+
+void FakeZelkor::record(std::string call) {
+  if (onCall) onCall(call);
+  calls.push_back(std::move(call));
 }
 
 void FakeZelkor::deliver(std::string_view event, zelkor::KeyValueMessage message) {

@@ -48,12 +48,14 @@ struct FakeConsole final : Console {
 };
 
 struct FakeAlerts final : AlertPresenter {
-  void present(Alert alert) override { shown.push_back(std::move(alert)); }
+  void present(Alert alert) override;
+  std::function<void(const Alert& alert)> onPresent;
   std::vector<Alert> shown;
 };
 
 struct FakeAnalytics final : AnalyticsSink {
-  void send(std::string_view event, const Payload& payload) override { sent.emplace_back(event, payload); }
+  void send(std::string_view event, const Payload& payload) override;
+  std::function<void(std::string_view event)> onSend;
   std::vector<std::pair<std::string, Payload>> sent;
 };
 
@@ -93,11 +95,15 @@ class FakeZelkor final : public zelkor::client::Library {
   /// Every operation in order, such as "CreateManager", "RegisterEventHandler kEventMetric", "EventsOn",
   /// "kCommandQueryMetric".
   std::vector<std::string> calls;
+  /// Told of each call as it comes, for a transcript that mixes calls with log lines.
+  std::function<void(const std::string& call)> onCall;
   std::vector<Command> commands;
   /// Answer by command name; success for all others.
   std::map<std::string, zelkor::client::Result, std::less<>> answers;
 
  private:
+  void record(std::string call);
+
   std::map<std::string, zelkor::client::EventHandler, std::less<>> handlers_;
 };
 
