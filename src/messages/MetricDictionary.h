@@ -135,7 +135,7 @@ void MetricDictionary::set(std::string_view key, Value&& value) {
 
 template <typename Value>
 void MetricDictionary::append(Text key, Value&& value) {
-  entries_.push_back(MetricEntry{std::move(key), MetricValue(std::forward<Value>(value))});
+  entries_.emplace_back(std::move(key), std::forward<Value>(value));
 }
 
 }  // namespace quorl

@@ -1,6 +1,6 @@
-#include "base/Uuid.h"
-
 #include <gtest/gtest.h>
+
+#include "base/Uuid.h"
 
 namespace quorl {
 namespace {

@@ -1,0 +1,127 @@
+#include <utility>
+
+#include "base/Log.h"
+#include "messages/KBBMetricUtility.h"
+#include "messages/MessageFields.h"
+#include "messages/wire/WireReader.h"
+
+namespace quorl {
+
+namespace {
+
+constexpr Logger logger{"metric-related"};
+
+constexpr std::uint64_t kLengthDelimited = 2;
+constexpr std::uint64_t kEndGroup = 4;
+
+using fields::member;
+using fields::setFlag;
+
+template <typename T, typename Read>
+bool readList(WireReader& reader, ListRecord<T>& list, std::uint64_t wireType, Read read) {
+  if (wireType != kLengthDelimited) {
+    list.add(read());
+    return true;
+  }
+  std::uint64_t mark = 0;
+  if (!reader.placeMark(mark)) return false;
+  while (reader.pos < reader.length && !reader.error) list.add(read());
+  reader.recallMark(mark);
+  return true;
+}
+
+}  // namespace
+
+void MetricCodable::initWithData(const std::optional<ByteString>& payload) {
+  WireReader reader(payload ? payload->view() : std::string_view{});
+  readFields(reader, table());
+}
+
+bool MetricCodable::readFrom(WireReader& reader) {
+  return readFields(reader, table());
+}
+
+bool MetricCodable::readFields(WireReader& reader, const MessageTable& table) {
+  bool canGoOn = true;
+  while (reader.pos < reader.length) {
+    if (reader.error) break;
+    const std::uint64_t key = reader.readVarint();
+    const std::uint64_t wireType = key & 7U;
+    if (reader.error || wireType == kEndGroup) break;
+    const auto tag = static_cast<std::uint32_t>(key >> 3U);
+    if (const FieldEntry* field = table.find(tag)) {
+      canGoOn = readField(reader, *field, wireType);
+    } else if (!table.acceptsMetricIdTags && KBBMetricUtility::isValidMetricIdTag(tag, table)) {
+      const auto value = static_cast<std::uint32_t>(reader.readVarint());
+      logger.log("Unknown tag: %x:%u", tag, value);
+    } else {
+      canGoOn = reader.skipValue(tag, static_cast<std::uint32_t>(wireType));
+    }
+    if (!canGoOn) break;
+  }
+  if (canGoOn && !reader.error) return true;
+  isReadWhole_ = false;
+  return false;
+}
+
+bool MetricCodable::readField(WireReader& reader, const FieldEntry& field, std::uint64_t wireType) {
+  // The wire type is not compared with the field's. A scalar counts as present even if its value cannot be read.
+  const std::size_t offset = field.offset;
+  switch (field.kind) {
+    case FieldKind::UInt32:
+      setFlag(*this, field);
+      member<std::uint32_t>(*this, offset) = static_cast<std::uint32_t>(reader.readVarint());
+      return true;
+    case FieldKind::UInt64:
+      setFlag(*this, field);
+      member<std::uint64_t>(*this, offset) = reader.readVarint();
+      return true;
+    case FieldKind::Int32:
+    case FieldKind::Enumeration:
+      setFlag(*this, field);
+      member<std::int32_t>(*this, offset) = static_cast<std::int32_t>(reader.readVarint());
+      return true;
+    case FieldKind::SInt32:
+      setFlag(*this, field);
+      member<std::int32_t>(*this, offset) = reader.readZigZag32();
+      return true;
+    case FieldKind::Bool:
+      setFlag(*this, field);
+      member<bool>(*this, offset) = reader.readVarint() != 0;
+      return true;
+    case FieldKind::Bytes:
+      member<std::optional<ByteString>>(*this, offset) = reader.readBytes();
+      return true;
+    case FieldKind::String:
+      member<std::optional<Text>>(*this, offset) = reader.readString();
+      return true;
+    case FieldKind::Message: {
+      auto& child = member<AnyMessageRef>(*this, offset);
+      child = AnyMessageRef(std::unique_ptr<MetricCodable>(field.message->make()));
+      return readChild(reader, *child.message(), *field.message);
+    }
+    case FieldKind::RepeatedMessage: {
+      MetricCodable& child = member<AnyMessageArray>(*this, offset)
+                                 .addElement(AnyMessageRef(std::unique_ptr<MetricCodable>(field.message->make())));
+      return readChild(reader, child, *field.message);
+    }
+    case FieldKind::RepeatedUInt32:
+      return readList(reader, member<UInt32List>(*this, offset), wireType,
+                      [&] { return static_cast<std::uint32_t>(reader.readVarint()); });
+    case FieldKind::RepeatedUInt64:
+      return readList(reader, member<UInt64List>(*this, offset), wireType, [&] { return reader.readVarint(); });
+    case FieldKind::RepeatedSInt32:
+      return readList(reader, member<SInt32List>(*this, offset), wireType, [&] { return reader.readZigZag32(); });
+  }
+  return false;
+}
+
+bool MetricCodable::readChild(WireReader& reader, MetricCodable& child, const MessageTable& table) {
+  std::uint64_t mark = 0;
+  // After a failure the reader's length stays narrowed; nobody reads on.
+  if (!reader.placeMark(mark) || !child.readFields(reader, table)) return false;
+  reader.recallMark(mark);
+  return true;
+}
+
+}  // namespace quorl

@@ -1,0 +1,126 @@
+#include "messages/wire/WireReader.h"
+
+#include <string>
+
+#include <unicode/utf8.h>
+
+namespace quorl {
+
+namespace {
+
+constexpr int kMaxVarintBytes = 10;
+
+/// Length of the character that begins at `at`; 0 if it is ill-formed, with `at` behind the ill-formed sequence.
+std::size_t nextCharacter(std::string_view text, std::size_t& at) {
+  const auto* bytes = reinterpret_cast<const std::uint8_t*>(text.data());
+  const std::size_t begin = at;
+  UChar32 character = 0;
+  U8_NEXT(bytes, at, text.size(), character);
+  return character < 0 ? 0 : at - begin;
+}
+
+bool isWellFormed(std::string_view text) {
+  for (std::size_t at = 0; at < text.size();) {
+    if (static_cast<std::uint8_t>(text[at]) < 0x80)
+      ++at;
+    else if (nextCharacter(text, at) == 0)
+      return false;
+  }
+  return true;
+}
+
+std::string repaired(std::string_view text) {
+  std::string result;
+  for (std::size_t at = 0; at < text.size();) {
+    const std::size_t begin = at;
+    const std::size_t size = nextCharacter(text, at);
+    result += size == 0 ? std::string_view("\xEF\xBF\xBD") : text.substr(begin, size);
+  }
+  return result;
+}
+
+}  // namespace
+
+std::uint64_t WireReader::readLongVarint() {
+  std::uint64_t value = 0;
+  unsigned shift = 0;
+  if (length >= kMaxVarintBytes && pos <= length - kMaxVarintBytes && !error) {
+    const std::uint8_t* at = bytes + pos;
+    for (int i = 0; i < kMaxVarintBytes; ++i, shift += 7) {
+      const std::uint8_t byte = at[i];
+      value |= static_cast<std::uint64_t>(byte & 0x7FU) << shift;
+      if (byte < 0x80) {
+        pos += static_cast<std::uint64_t>(i) + 1;
+        return value;
+      }
+    }
+    pos += kMaxVarintBytes;
+    return 0;
+  }
+  for (int i = 0; i < kMaxVarintBytes; ++i, shift += 7) {
+    std::uint8_t byte = 0;
+    if (pos >= length)
+      error = true;
+    else
+      byte = bytes[pos++];
+    value |= static_cast<std::uint64_t>(byte & 0x7FU) << shift;
+    if (byte < 0x80) return error ? 0 : value;
+  }
+  return 0;
+}
+
+std::optional<ByteString> WireReader::readBytes() {
+  std::uint64_t size = 0;
+  if (!readLength(size)) return std::nullopt;
+  std::optional<ByteString> result(std::in_place, view(size));
+  pos += size;
+  return result;
+}
+
+std::optional<Text> WireReader::readString() {
+  std::uint64_t size = 0;
+  if (!readLength(size)) return std::nullopt;
+  const std::string_view text = view(size);
+  pos += size;
+  return isWellFormed(text) ? Text(text) : Text(repaired(text));
+}
+
+bool WireReader::skipBytes(std::uint64_t count) {
+  if (count > length - pos) return false;
+  pos += count;
+  return true;
+}
+
+bool WireReader::skipValue(std::uint32_t tag, std::uint32_t wireType) {
+  std::uint64_t size = 0;
+  switch (wireType) {
+    case 0:
+      readVarint();
+      return !error;
+    case 1:
+      return skipBytes(8);
+    case 2:
+      return readLength(size) && skipBytes(size);
+    case 3:
+      return skipGroup(tag, 1);
+    case 5:
+      return skipBytes(4);
+    default:
+      return false;
+  }
+}
+
+bool WireReader::skipGroup(std::uint32_t tag, int depth) {
+  if (depth > kMaxGroupDepth) return false;
+  while (pos < length) {
+    const std::uint64_t key = readVarint();
+    if (error) return false;
+    const auto innerTag = static_cast<std::uint32_t>(key >> 3U);
+    const auto wireType = static_cast<std::uint32_t>(key & 7U);
+    if (wireType == 4) return innerTag == tag;
+    if (wireType == 3 ? !skipGroup(innerTag, depth + 1) : !skipValue(innerTag, wireType)) return false;
+  }
+  return false;
+}
+
+}  // namespace quorl
