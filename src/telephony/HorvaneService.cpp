@@ -38,7 +38,7 @@ CarrierInfoObject makeRecord(const HVServiceSubscriptionContext& context) {
 }
 
 std::string text(const std::optional<SQLiteError>& error) {
-  return error ? logText(*error) : std::string();
+  return error ? logText(*error) : "nil";
 }
 
 }  // namespace

@@ -18,7 +18,8 @@
 //   {"atMs": 0, "event": "simInserted", "slot": 1, "carrier": "Testnet One"}
 //
 // Every line has "atMs" (whole milliseconds from the start of the run, 0 to 30 days) and "event". Lines need no order;
-// lines of one time happen in the order of the file. Blank lines are skipped. The events and their fields:
+// lines of one time happen in the order of the file. Those of time 0 are how the phone is found at the start. Blank
+// lines are skipped. The events and their fields:
 //
 //   simInserted   slot, carrier (text; left out or null: no name yet)    SIM comes, cell monitor update
 //   simRemoved    slot                                                   SIM goes, cell monitor update

@@ -279,6 +279,10 @@ void TelephonySimulator::play(std::vector<TelephonyScriptStep> steps, Queue& que
   std::map<std::chrono::milliseconds, std::vector<telephony_event::Event>> byTime;
   for (TelephonyScriptStep& step : steps) byTime[step.at].push_back(std::move(step.event));
   for (auto& [at, events] : byTime) {
+    if (at == std::chrono::milliseconds::zero()) {
+      for (const telephony_event::Event& event : events) perform(event);
+      continue;
+    }
     queue.asyncAfter(at, [weak = std::weak_ptr(state_), events = std::move(events)] {
       const auto state = weak.lock();
       if (!state) return;

@@ -39,8 +39,9 @@ class TelephonySimulator final : public HorvaneClientFactory {
 
   /// Does what one step of a script says, at once. A step for a slot other than 1 and 2 does nothing.
   void perform(const telephony_event::Event& event);
-  /// Performs the steps on `queue`, each at its time counted from now; steps of one time in their order. Steps still
-  /// to come are dropped when the simulator goes away. `queue` must outlive it.
+  /// Performs the steps of time 0 inside the call, so that whoever starts afterwards finds the phone so, and the later
+  /// ones on `queue`, each at its time counted from now; steps of one time in their order. Steps still to come are
+  /// dropped when the simulator goes away. `queue` must outlive it.
   void play(std::vector<TelephonyScriptStep> steps, Queue& queue);
 
  private:
