@@ -10,15 +10,13 @@
 #include <utility>
 #include <vector>
 
-#include <gtest/gtest.h>
-
 #include "base/Queue.h"
-#include "store/PersistanceStoreProtocol.h"
+#include "telephony/StoreForRows.h"
 
 namespace quorl::test {
 
 /// A store in memory that keeps what a test wants to look at. Completions come on the main queue, as the real one's do.
-class FakeStore final : public PersistanceStoreProtocol {
+class FakeStore final : public StoreForRows {
  public:
   struct Read {
     std::string metricTech;
@@ -48,14 +46,6 @@ class FakeStore final : public PersistanceStoreProtocol {
       mainQueue_.async(std::move(answer));
     }
   }
-
-  // What the service never asks for.
-  void fetchAvailableMetrics(std::int32_t, AvailableMetricsCompletion) override { ADD_FAILURE(); }
-  void fetchAttributeHistory(std::string_view, std::string_view, AttributeDetailTimeFrame, MetricsCompletion) override {
-    ADD_FAILURE();
-  }
-  void fetchDashboard(std::int32_t, DashboardCompletion) override { ADD_FAILURE(); }
-  void exportMetrics(AttributeDetailTimeFrame, MetricsCompletion) override { ADD_FAILURE(); }
 
   /// Completes the reads that were held back.
   void release() {

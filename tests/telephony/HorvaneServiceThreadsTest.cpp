@@ -16,8 +16,8 @@
 #include "hosts/simulator/TelephonySimulator.h"
 #include "shell/NotificationNames.h"
 #include "support/FakePlatform.h"
-#include "telephony/FakeStore.h"
 #include "telephony/HorvaneService.h"
+#include "telephony/StoreForRows.h"
 
 namespace quorl::test {
 namespace {
@@ -37,7 +37,7 @@ class KeepingFactory final : public QueueFactory {
 
 /// A store with a thread of its own, as the real one has. Reads that found nothing complete there, those that found
 /// rows on the main queue.
-class ThreadedStore final : public PersistanceStoreProtocol {
+class ThreadedStore final : public StoreForRows {
  public:
   ThreadedStore(Queue& mainQueue, std::shared_ptr<Queue> database) : main_(mainQueue), database_(std::move(database)) {}
 
@@ -60,12 +60,6 @@ class ThreadedStore final : public PersistanceStoreProtocol {
       }
     });
   }
-  void fetchAvailableMetrics(std::int32_t, AvailableMetricsCompletion) override { ADD_FAILURE(); }
-  void fetchAttributeHistory(std::string_view, std::string_view, AttributeDetailTimeFrame, MetricsCompletion) override {
-    ADD_FAILURE();
-  }
-  void fetchDashboard(std::int32_t, DashboardCompletion) override { ADD_FAILURE(); }
-  void exportMetrics(AttributeDetailTimeFrame, MetricsCompletion) override { ADD_FAILURE(); }
 
  private:
   Queue& main_;
