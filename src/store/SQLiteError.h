@@ -1,6 +1,8 @@
 #pragma once
 
+#include <optional>
 #include <string>
+#include <string_view>
 
 namespace quorl {
 
@@ -22,5 +24,11 @@ struct SQLiteError {
 
 /// The default description of an error value: `Prepare(message: "near \"x\": syntax error")`, `EmptyQueryResult`.
 std::string logText(const SQLiteError& error);
+/// The description of an optional error: `Optional(Prepare(message: "..."))`, `nil`.
+std::string logText(const std::optional<SQLiteError>& error);
+
+/// The default description of an enumeration's case that carries a text: `name(message: "...")`, with quotes,
+/// backslashes and line breaks of `message` escaped.
+std::string caseDescription(std::string_view name, std::string_view message);
 
 }  // namespace quorl

@@ -1,0 +1,239 @@
+#include <cstdint>
+#include <functional>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <utility>
+#include <vector>
+
+#include <sqlite3.h>
+
+#include "app/HardwareManager.h"
+#include "base/DateText.h"
+#include "store/DBManager.h"
+#include "store/DBManagerWork.h"
+#include "store/EnumeratorPrefix.h"
+#include "store/MetricStatements.h"
+
+namespace quorl {
+
+using store_detail::failOnMain;
+using store_detail::succeedOnMain;
+
+namespace {
+
+SQLiteError emptyQueryResult() {
+  return {SQLiteError::Case::EmptyQueryResult, {}};
+}
+
+/// The error that three of the reads report: a new one that carries the description of the first.
+SQLiteError described(const SQLiteError& error) {
+  return {SQLiteError::Case::Prepare, logText(error)};
+}
+
+/// The columns of the row at hand. A NULL text reads as empty and is remembered for the whole row.
+class RowReader {
+ public:
+  explicit RowReader(sqlite3_stmt* statement) : statement_(statement) {}
+
+  /// Valid until the next step.
+  std::string_view view(int column) {
+    const unsigned char* text = sqlite3_column_text(statement_, column);
+    if (text == nullptr) {
+      hasNull_ = true;
+      return {};
+    }
+    return reinterpret_cast<const char*>(text);
+  }
+  std::string text(int column) { return std::string(view(column)); }
+  std::int32_t integer(int column) { return sqlite3_column_int(statement_, column); }
+  bool hasNull() const { return hasNull_; }
+
+ private:
+  sqlite3_stmt* const statement_;
+  bool hasNull_ = false;
+};
+
+/// Localised attribute names of one read: few names, many rows.
+class LocalizedNames {
+ public:
+  const std::string& of(const std::string& key) {
+    const auto found = names_.find(key);
+    if (found != names_.end()) return found->second;
+    return names_.emplace(key, strings_.localized(key)).first->second;
+  }
+
+ private:
+  StringTable& strings_ = Platform::current().strings;
+  std::unordered_map<std::string, std::string> names_;
+};
+
+}  // namespace
+
+void SQLiteDatabase::fetchAvailableMetrics(std::int32_t subsId, AvailableMetricsCompletion completion) {
+  enqueueRead([subsId, completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    auto statement = self.prepareStatement(SQLTable<Metric>::availableMetrics(subsId).c_str());
+    if (!statement) return failOnMain(std::move(completion), described(statement.error()));
+    AvailableMetrics metrics;
+    WallClockReader dates;
+    while (sqlite3_step(statement->get()) == SQLITE_ROW) {
+      RowReader row(statement->get());
+      std::string metricTech = row.text(0);
+      MetricList entry;
+      entry.metricName = row.text(1);
+      const std::string_view collectedOn = row.view(2);
+      entry.subsId = row.integer(3);
+      if (row.hasNull()) {
+        statement->reset();
+        return completion({}, emptyQueryResult());
+      }
+      const std::optional<Date> date = dates.read(collectedOn);
+      entry.collectedOn = date ? *date : Platform::current().clock.now();
+      metrics[std::move(metricTech)].push_back(std::move(entry));
+    }
+    statement->reset();
+    succeedOnMain(std::move(completion), std::move(metrics));
+  });
+}
+
+void SQLiteDatabase::fetchMetricContents(std::string_view metricTech, std::string_view metricName,
+                                         std::optional<std::string_view> attributeName, std::int32_t subsId,
+                                         MetricsCompletion completion) {
+  enqueueRead([metricTech = std::string(metricTech), metricName = std::string(metricName),
+               attributeName = attributeName ? std::optional<std::string>(*attributeName) : std::nullopt, subsId,
+               completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    auto statement =
+        self.prepareStatement(SQLTable<Metric>::metricContents(metricTech, metricName, attributeName, subsId).c_str());
+    if (!statement) return failOnMain(std::move(completion), statement.error());
+    std::vector<Metric> metrics;
+    WallClockReader dates;
+    LocalizedNames names;
+    while (sqlite3_step(statement->get()) == SQLITE_ROW) {
+      RowReader row(statement->get());
+      Metric metric;
+      metric.metricTech = row.text(1);
+      metric.metricName = row.text(2);
+      metric.attributeNameNonLocalized = row.text(3);
+      metric.attributeValue = row.text(4);
+      metric.attributeValueType = row.text(5);
+      metric.graphable = row.integer(6) == 1;
+      metric.metricId = row.text(7);
+      metric.subsId = row.integer(8);
+      const std::string_view collectedOn = row.view(9);
+      if (row.hasNull()) return failOnMain(std::move(completion), emptyQueryResult());
+      const std::optional<Date> date = dates.read(collectedOn);
+      if (!date) {
+        statement->reset();
+        return completion({}, emptyQueryResult());
+      }
+      metric.id = Uuid::make();
+      metric.attributeName = names.of(metric.attributeNameNonLocalized);
+      removeEnumeratorPrefix(metric.attributeValue);
+      metric.collectedOn = *date;
+      metrics.push_back(std::move(metric));
+    }
+    // The library's text is never empty, so a read that went well prints this line too.
+    if (const std::string message = self.libraryMessage(); !message.empty())
+      Platform::current().console.print("error occurred while fetching metric contents " + message);
+    statement->reset();
+    succeedOnMain(std::move(completion), std::move(metrics));
+  });
+}
+
+void SQLiteDatabase::fetchAttributeHistory(std::string_view metricName, std::string_view attributeName,
+                                           AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) {
+  enqueueRead([metricName = std::string(metricName), attributeName = std::string(attributeName), timeFrame,
+               completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    // The subscription is the one that is current now, not at the call.
+    const std::int32_t currentSubsId = HardwareManager::shared().currentSubsId();
+    auto statement = self.prepareStatement(
+        SQLTable<Metric>::attributeHistory(metricName, attributeName, timeFrame, currentSubsId).c_str());
+    if (!statement) return failOnMain(std::move(completion), statement.error());
+    std::vector<Metric> metrics;
+    WallClockReader dates;
+    LocalizedNames names;
+    while (sqlite3_step(statement->get()) == SQLITE_ROW) {
+      RowReader row(statement->get());
+      Metric metric;
+      metric.metricTech = row.text(0);
+      metric.metricName = row.text(1);
+      metric.attributeNameNonLocalized = row.text(2);
+      metric.attributeValue = row.text(3);
+      metric.attributeValueType = row.text(4);
+      metric.metricId = row.text(5);
+      metric.subsId = row.integer(6);
+      const std::string_view collectedOn = row.view(7);
+      if (row.hasNull()) return failOnMain(std::move(completion), emptyQueryResult());
+      const std::optional<Date> date =
+          timeFrame == AttributeDetailTimeFrame::daily ? dates.read(collectedOn) : dates.readDay(collectedOn);
+      if (!date) return failOnMain(std::move(completion), emptyQueryResult());
+      metric.id = Uuid::make();
+      metric.attributeName = names.of(metric.attributeNameNonLocalized);
+      removeEnumeratorPrefix(metric.attributeValue);
+      metric.collectedOn = *date;
+      metrics.push_back(std::move(metric));
+    }
+    statement->reset();
+    succeedOnMain(std::move(completion), std::move(metrics));
+  });
+}
+
+void SQLiteDatabase::fetchDashboard(std::int32_t subsId, DashboardCompletion completion) {
+  enqueueRead([subsId, completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    auto statement = self.prepareStatement(SQLTable<Metric>::dashboard(subsId).c_str());
+    if (!statement) return failOnMain(std::move(completion), described(statement.error()));
+    std::vector<DashboardTableItem> items;
+    while (sqlite3_step(statement->get()) == SQLITE_ROW) {
+      RowReader row(statement->get());
+      DashboardTableItem item;
+      item.metricTech = row.text(0);
+      item.metricId = row.text(1);
+      item.metricName = row.text(2);
+      item.attributeName = row.text(3);
+      item.subsId = row.integer(4);
+      if (row.hasNull()) {
+        statement->reset();
+        return completion({}, emptyQueryResult());
+      }
+      items.push_back(std::move(item));
+    }
+    statement->reset();
+    succeedOnMain(std::move(completion), std::move(items));
+  });
+}
+
+void SQLiteDatabase::exportMetrics(AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) {
+  enqueueRead([timeFrame, completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    auto prepared = self.prepareStatement(exportStatement(timeFrame));
+    if (!prepared) return failOnMain(std::move(completion), described(prepared.error()));
+    // Left unfinalised on purpose, until the connection is closed.
+    sqlite3_stmt* const statement = prepared->release();
+    std::vector<Metric> metrics;
+    WallClockReader dates;
+    LocalizedNames names;
+    while (sqlite3_step(statement) == SQLITE_ROW) {
+      RowReader row(statement);
+      Metric metric;
+      metric.metricTech = row.text(0);
+      metric.metricName = row.text(1);
+      metric.attributeNameNonLocalized = row.text(2);
+      metric.attributeValue = row.text(3);
+      metric.subsId = row.integer(4);
+      metric.metricId = row.text(5);
+      const std::string_view collectedOn = row.view(6);
+      const std::optional<Date> date = dates.read(collectedOn);
+      if (row.hasNull() || !date) {
+        // Its snapshot must not outlive the read, or the journal could never be taken back.
+        sqlite3_reset(statement);
+        return completion({}, emptyQueryResult());
+      }
+      metric.id = Uuid::make();
+      metric.attributeName = names.of(metric.attributeNameNonLocalized);
+      metric.collectedOn = *date;
+      metrics.push_back(std::move(metric));
+    }
+    succeedOnMain(std::move(completion), std::move(metrics));
+  });
+}
+
+}  // namespace quorl
