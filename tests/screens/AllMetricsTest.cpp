@@ -216,7 +216,7 @@ TEST_F(AllMetricsTest, AFailedReadLeavesTheListAndLogs) {
   launch();
   stored(reading("LTE", "Tx Power", "power", "11"));
   open();
-  sql("DROP TABLE Metric");
+  loses("Metric");
   EXPECT_EQ(loaded(), false);
   EXPECT_THAT(techs(), ElementsAre("RAT", "LTE"));
   const auto lines = log.lines();
@@ -232,7 +232,7 @@ TEST_F(AllMetricsTest, AFailedReadAfterAChangeOfSubscriptionDoesNotReloadTheScre
   launch();
   stored(reading("LTE", "Tx Power", "power", "11"));
   open();
-  sql("DROP TABLE Metric");
+  loses("Metric");
   chooses(1);
   EXPECT_EQ(screen->reloads, 0);
   EXPECT_THAT(techs(), ElementsAre("RAT", "LTE"));

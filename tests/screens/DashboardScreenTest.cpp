@@ -121,7 +121,7 @@ TEST_F(ManageDashboardTest, TheControlOpensItWithThePinsOfTheCurrentSubscription
 
 TEST_F(ManageDashboardTest, TheControlOpensNothingWhenThePinsCannotBeRead) {
   openWithTwoReadings();
-  sql("DROP TABLE Dashboard");
+  loses("Dashboard");
   int opened = 0;
   const Connection connection = screen->onOpenManaging([&](const auto&) { ++opened; });
   screen->manageDashboardTapped();

@@ -187,7 +187,7 @@ TEST_F(DashboardTest, RemovingAllPinsButOneMakesTheNextStartSeedAgain) {
 TEST_F(DashboardTest, AFailedReadOfThePinsSeedsInVainAndLogs) {
   isIce();
   launch();
-  sql("DROP TABLE Dashboard");
+  loses("Dashboard");
   open();
   EXPECT_TRUE(log.has("DashboardViewModel -  loadDashboardData - dashboardList.isempty"));
   EXPECT_THAT(log.texts("dashboard"),
@@ -198,7 +198,7 @@ TEST_F(DashboardTest, AFailedReadOfThePinsSeedsInVainAndLogs) {
   EXPECT_EQ(model->state(), State::seeding);
 }
 
-TEST_F(DashboardTest, APinThatCannotBeReadSeedsOnTheDatabasesQueue) {
+TEST_F(DashboardTest, APinThatCannotBeReadSeeds) {
   isIce();
   launch();
   sql("INSERT INTO Dashboard (metric_tech, metric_id, metric_name, attribute_name, subs_id) VALUES (NULL, '1', 'Odd', "
@@ -240,7 +240,7 @@ TEST_F(DashboardTest, ATickThatFindsTooLittleLogsAnErrorAndLeavesTheRows) {
 
 TEST_F(DashboardTest, ATickWhoseReadFailsLogsAnErrorAndLeavesTheRows) {
   openWithTwoReadings();
-  sql("DROP TABLE Dashboard");
+  loses("Dashboard");
   pass(15s);
   const auto lines = log.lines();
   EXPECT_TRUE(std::any_of(lines.begin(), lines.end(), [](const test::LogLine& logged) {

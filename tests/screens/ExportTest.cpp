@@ -183,7 +183,7 @@ TEST_F(ExportTest, NothingStoredGivesAnEmptyText) {
 
 TEST_F(ExportTest, AFailedReadIsLoggedAndTheLoadingViewStaysAsMeant) {
   launch();
-  sql("DROP TABLE Metric");
+  loses("Metric");
   open();
   taps("Weekly");
   settle();

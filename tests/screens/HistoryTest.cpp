@@ -125,7 +125,7 @@ TEST_F(HistoryTest, TellsWhenTheViewIsThere) {
 
 TEST_F(HistoryTest, AFailureOfAllReadsIsLoggedAndTheViewComesAllTheSame) {
   launch();
-  sql("DROP TABLE Metric");
+  loses("Metric");
   open();
   EXPECT_THAT(model().dataSource(), IsEmpty());
   // Monthly does say weekly.

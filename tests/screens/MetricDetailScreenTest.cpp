@@ -168,6 +168,7 @@ TEST_F(MetricDetailScreenTest, ANewReadingGetsANewCell) {
 // Graphs.
 
 TEST_F(MetricDetailScreenTest, OnlyBuildsForEngineersAndCarriersShowTheGraphSymbol) {
+  livesNow();
   launch();
   Metric graphable = reading("RAT", "Cell Info", "kHVCellMonitorCellId", "77");
   graphable.graphable = true;

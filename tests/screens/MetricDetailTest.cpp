@@ -124,7 +124,7 @@ TEST_F(MetricDetailTest, TheSpinnerEndsAfterThirtySecondsIfTheReadNeverReturns) 
 
 TEST_F(MetricDetailTest, TheSpinnerEndsWhenTheReadFails) {
   launch();
-  sql("DROP TABLE Metric");
+  loses("Metric");
   open("LTE", "Tx Power");
   settle();
   EXPECT_FALSE(model->shouldShowSPinner());
@@ -374,7 +374,7 @@ TEST_F(MetricDetailTest, RowsOfSectionsAreNotMarkedAsMeant) {
 TEST_F(MetricDetailTest, AFailedReadOfThePinsStillTellsTheScreen) {
   launch();
   stored(reading("LTE", "Tx Power", "power", "11"));
-  sql("DROP TABLE Dashboard");
+  loses("Dashboard");
   opened("LTE", "Tx Power");
   EXPECT_EQ(model->metrics().size(), 1U);
   EXPECT_EQ(screen->refreshes, 1);
@@ -563,7 +563,7 @@ TEST_F(MetricDetailTest, AFailedReadLeavesTheRowsAndLogs) {
   launch();
   stored(reading("LTE", "Tx Power", "power", "11"));
   opened("LTE", "Tx Power");
-  sql("DROP TABLE Metric");
+  loses("Metric");
   model->processNewMetric(reading("LTE", "Tx Power", "power", "12"));
   settle();
   EXPECT_THAT(shown(), ElementsAre(Pair("power", "11")));

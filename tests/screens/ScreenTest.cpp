@@ -79,6 +79,13 @@ void ScreenTest::chooses(std::int32_t subsId) {
   settle();
 }
 
+void ScreenTest::loses(const std::string& table) {
+  store->executeDashboardStatement("DROP TABLE " + table,
+                                   [](bool success, std::optional<SQLiteError>) { EXPECT_TRUE(success); });
+  settle();
+  log.clear();
+}
+
 SteppedQueue& ScreenTest::databaseQueue() {
   for (const auto& queue : platform.time.queues())
     if (queue->label().starts_with("com.ardent.dbmanager.queue -")) return *queue;

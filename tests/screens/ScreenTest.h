@@ -61,6 +61,9 @@ class ScreenTest : public ::testing::Test {
   /// The queue on which the store's statements run.
   SteppedQueue& databaseQueue();
 
+  /// The store's own connection drops a table: statements that name it no longer prepare.
+  void loses(const std::string& table);
+
   // The file, through another connection.
   void sql(const std::string& text);
   std::int64_t number(const std::string& query);

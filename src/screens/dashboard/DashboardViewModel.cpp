@@ -70,6 +70,16 @@ void DashboardViewModel::startUpDidLoad(const std::optional<std::vector<Metric>>
     return;
   }
   dashboardLog.log("DashboardViewModel -  init -  loadDashboardData %{public}s", description(error));
+  if (Platform::current().mainQueue.isCurrent()) {
+    seed();
+    return;
+  }
+  Platform::current().mainQueue.async([weak = weak_from_this()] {  // a pin that cannot be read is reported elsewhere
+    if (const auto self = weak.lock()) self->seed();
+  });
+}
+
+void DashboardViewModel::seed() {
   loadInitialDashboard([weak = weak_from_this()](bool success) {
     const auto self = weak.lock();
     if (success && self) self->startTimer();

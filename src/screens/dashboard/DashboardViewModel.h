@@ -1,6 +1,5 @@
 #pragma once
 
-#include <atomic>
 #include <cstddef>
 #include <functional>
 #include <memory>
@@ -71,7 +70,6 @@ class DashboardViewModel final : public std::enable_shared_from_this<DashboardVi
   void updateDashboardDataSource(const std::vector<Metric>& rows);
 
   const std::vector<DashboardViewModelObject>& metrics() const { return metrics_; }
-  /// Any thread.
   State state() const { return state_; }
   const std::shared_ptr<PersistanceStore>& persistanceStore() const { return persistanceStore_; }
 
@@ -87,6 +85,7 @@ class DashboardViewModel final : public std::enable_shared_from_this<DashboardVi
 
   void start();
   void startUpDidLoad(const std::optional<std::vector<Metric>>& rows, const std::optional<SQLiteError>& error);
+  void seed();
   void loadInitialDashboard(SeedingCompletion completion);
   void loadSeededDashboard(SeedingCompletion completion);
   void startTimer();
@@ -99,7 +98,7 @@ class DashboardViewModel final : public std::enable_shared_from_this<DashboardVi
   DispatchGroup group_;
   std::unique_ptr<RepeatingTimer> timer_;
   std::vector<DashboardViewModelObject> metrics_;
-  std::atomic<State> state_ = State::loading;  // a start-up load may fail on the database's queue
+  State state_ = State::loading;
   Signal<const DashboardChange&> changed_;
   NotificationCenter::Observation subscriptionObservation_;
   NotificationCenter::Observation removalObservation_;

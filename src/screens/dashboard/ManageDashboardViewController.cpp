@@ -25,7 +25,7 @@ std::shared_ptr<ManageDashboardViewController> ManageDashboardViewController::ma
 void ManageDashboardViewController::swipeToDelete(std::size_t index) {
   if (index >= dashboardList_.size()) return;
   const DashboardTableItem& item = dashboardList_[index];
-  persistanceStore_->database().removeDashboardItem(
+  persistanceStore_->removeDashboardItem(
       item.metricTech, item.attributeName, item.subsId,
       [weak = weak_from_this(), item](bool success, std::optional<SQLiteError> error) {
         if (!success) {

@@ -165,7 +165,7 @@ void MetricDetailViewModel::updateDashboardItem(std::size_t index, bool isBookma
 }
 
 void MetricDetailViewModel::pin(const Metric& metric) {
-  persistanceStore_->database().executeDashboardStatement(
+  persistanceStore_->executeDashboardStatement(
       SQLTable<Metric>::pinAttribute(metric.metricTech, metric.attributeNameNonLocalized, metric.subsId),
       [](bool success, std::optional<SQLiteError> error) {
         if (success) {
@@ -178,7 +178,7 @@ void MetricDetailViewModel::pin(const Metric& metric) {
 }
 
 void MetricDetailViewModel::unpin(const Metric& metric) {
-  persistanceStore_->database().removeDashboardItem(
+  persistanceStore_->removeDashboardItem(
       metric.metricTech, metric.attributeNameNonLocalized, metric.subsId,
       [weak = weak_from_this()](bool success, std::optional<SQLiteError> error) {
         if (!success) {
