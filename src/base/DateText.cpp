@@ -59,6 +59,33 @@ std::optional<std::int64_t> dayAsUtc(std::string_view text) {
   return std::chrono::sys_days{date}.time_since_epoch().count() * kSecondsPerDay;
 }
 
+std::string formatted(Date date, icu::DateFormat& format) {
+  // Asked of the system each time, so that a zone changed during the run shows at once.
+  format.adoptTimeZone(icu::TimeZone::detectHostTimeZone());
+  const double milliseconds = static_cast<double>(date.time_since_epoch().count()) / 1000.0;
+  icu::UnicodeString shown;
+  format.format(milliseconds, shown);
+  std::string utf8;
+  shown.toUTF8String(utf8);
+  return utf8;
+}
+
+icu::DateFormat::EStyle icuStyle(DateTextStyle style) {
+  switch (style) {
+    case DateTextStyle::None:
+      return icu::DateFormat::kNone;
+    case DateTextStyle::Short:
+      return icu::DateFormat::kShort;
+    case DateTextStyle::Medium:
+      return icu::DateFormat::kMedium;
+    case DateTextStyle::Long:
+      return icu::DateFormat::kLong;
+    case DateTextStyle::Full:
+      return icu::DateFormat::kFull;
+  }
+  return icu::DateFormat::kDefault;
+}
+
 }  // namespace
 
 std::string wallClockText(Date date) {
@@ -129,14 +156,14 @@ std::string patternText(Date date, std::string_view pattern) {
       icu::UnicodeString::fromUTF8(icu::StringPiece(pattern.data(), static_cast<std::int32_t>(pattern.size())));
   icu::SimpleDateFormat format(icuPattern, icu::Locale::getDefault(), status);
   if (U_FAILURE(status)) return wallClockText(date);
-  // Asked of the system each time, so that a zone changed during the run shows at once.
-  format.adoptTimeZone(icu::TimeZone::detectHostTimeZone());
-  const double milliseconds = static_cast<double>(date.time_since_epoch().count()) / 1000.0;
-  icu::UnicodeString shown;
-  format.format(milliseconds, shown);
-  std::string utf8;
-  shown.toUTF8String(utf8);
-  return utf8;
+  return formatted(date, format);
+}
+
+std::string styledText(Date date, DateTextStyle dateStyle, DateTextStyle timeStyle) {
+  if (dateStyle == DateTextStyle::None && timeStyle == DateTextStyle::None) return {};
+  const std::unique_ptr<icu::DateFormat> format(
+      icu::DateFormat::createDateTimeInstance(icuStyle(dateStyle), icuStyle(timeStyle), icu::Locale::getDefault()));
+  return format ? formatted(date, *format) : wallClockText(date);
 }
 
 }  // namespace quorl

@@ -46,4 +46,10 @@ std::string utcText(Date date);
 /// Thread-safe.
 std::string patternText(Date date, std::string_view pattern);
 
+enum class DateTextStyle { None, Short, Medium, Long, Full };
+
+/// `date` in the customary form of the device's locale, in its current time zone: the date in one style and the time
+/// of day in another. A style of `None` leaves that part away, both of them everything. Thread-safe.
+std::string styledText(Date date, DateTextStyle dateStyle, DateTextStyle timeStyle);
+
 }  // namespace quorl

@@ -148,5 +148,25 @@ TEST(DateTextTest, PatternsFollowZoneAndLocale) {
   }
 }
 
+TEST(DateTextTest, StylesFollowZoneAndLocale) {
+  using Style = DateTextStyle;
+  const Date date = utc(2026, 1, 5, 9, 30, 12);
+  {
+    const ScopedTimeZone zone("America/New_York");
+    const ScopedLocale locale("en_US");
+    EXPECT_EQ(styledText(date, Style::Short, Style::None), "1/5/26");
+    EXPECT_EQ(styledText(date, Style::Medium, Style::None), "Jan 5, 2026");
+    EXPECT_EQ(styledText(date, Style::Long, Style::None), "January 5, 2026");
+    EXPECT_EQ(styledText(date, Style::Full, Style::None), "Monday, January 5, 2026");
+    EXPECT_EQ(styledText(date, Style::None, Style::None), "");
+  }
+  {
+    const ScopedTimeZone zone("Europe/Berlin");
+    const ScopedLocale locale("de_DE");
+    EXPECT_EQ(styledText(date, Style::None, Style::Short), "10:30");
+    EXPECT_EQ(styledText(date, Style::Medium, Style::Medium), "05.01.2026, 10:30:12");
+  }
+}
+
 }  // namespace
 }  // namespace quorl

@@ -56,7 +56,7 @@ void SteppedQueue::asyncAfter(Duration delay, Task task) {
 }
 
 bool SteppedQueue::step() {
-  if (tasks_.empty()) return false;
+  if (tasks_.empty() || isHanging_) return false;
   Task task = std::move(tasks_.front());
   tasks_.pop_front();
   isRunning_ = true;

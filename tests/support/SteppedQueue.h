@@ -59,15 +59,18 @@ class SteppedQueue final : public Queue, public std::enable_shared_from_this<Ste
   bool isCurrent() const override { return isRunning_; }
   const std::string& label() const override { return label_; }
 
-  /// Runs the first waiting task. False when none waits.
+  /// Runs the first waiting task. False when none waits, or while the queue hangs.
   bool step();
   std::size_t waiting() const { return tasks_.size(); }
+  /// While it hangs no task runs, as behind one that never ends.
+  void setHanging(bool isHanging) { isHanging_ = isHanging; }
 
  private:
   VirtualTime& time_;
   const std::string label_;
   std::deque<Task> tasks_;
   bool isRunning_ = false;
+  bool isHanging_ = false;
 };
 
 }  // namespace quorl::test

@@ -1,0 +1,121 @@
+#include "screens/export/ExportText.h"
+
+#include <array>
+#include <charconv>
+#include <chrono>
+#include <cstdint>
+#include <string_view>
+
+#include "base/DateText.h"
+
+namespace quorl {
+namespace {
+
+constexpr std::int64_t kSecondsPerDay = 86400;
+/// All that is not the rows' own texts: field names, separators, id, time, flags and a number.
+constexpr std::size_t kFixedSize = 352;
+
+void appendTwoDigits(char*& at, std::int64_t value) {
+  *at++ = static_cast<char>('0' + value / 10);
+  *at++ = static_cast<char>('0' + value % 10);
+}
+
+/// Writes times as `utcText` does, for many in a row: the text of the day is kept, as rows lie close together.
+class UtcTextWriter {
+ public:
+  void append(std::string& text, Date date) {
+    const auto seconds = std::chrono::floor<std::chrono::seconds>(date);
+    const auto day = std::chrono::floor<std::chrono::days>(seconds);
+    if (day != day_ || dayText_.empty()) {
+      day_ = day;
+      dayText_ = utcText(date).substr(0, utcText(date).find(' '));
+    }
+    const std::int64_t second = (seconds - day).count();
+    std::array<char, 15> clock;
+    char* at = clock.data();
+    *at++ = ' ';
+    appendTwoDigits(at, second / 3600);
+    *at++ = ':';
+    appendTwoDigits(at, second / 60 % 60);
+    *at++ = ':';
+    appendTwoDigits(at, second % 60);
+    text.append(dayText_).append(clock.data(), 9).append(" +0000");
+  }
+
+ private:
+  std::chrono::sys_days day_{};
+  std::string dayText_;
+};
+
+void appendUuid(std::string& text, const Uuid& id) {
+  constexpr char kDigits[] = "0123456789ABCDEF";
+  std::array<char, 36> digits;
+  std::size_t at = 0;
+  for (std::size_t i = 0; i < id.bytes.size(); ++i) {
+    if (i == 4 || i == 6 || i == 8 || i == 10) digits[at++] = '-';
+    digits[at++] = kDigits[id.bytes[i] >> 4];
+    digits[at++] = kDigits[id.bytes[i] & 0xF];
+  }
+  text.append(digits.data(), digits.size());
+}
+
+void appendInteger(std::string& text, std::int32_t value) {
+  std::array<char, 12> digits;
+  const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), value).ptr;
+  text.append(digits.data(), end);
+}
+
+std::string_view boolText(bool value) {
+  return value ? "true" : "false";
+}
+
+void append(std::string& text, const Metric& metric, UtcTextWriter& times) {
+  text.append("QuorlInternal_4.Metric(id: ");
+  appendUuid(text, metric.id);
+  text.append(", metricTech: ").append(metric.metricTech);
+  text.append(", metricName: ").append(metric.metricName);
+  text.append(", attributeName: ").append(metric.attributeName);
+  text.append(", attributeNameNonLocalized: ").append(metric.attributeNameNonLocalized);
+  text.append(", attributeValue: ").append(metric.attributeValue);
+  text.append(", attributeValueType: ").append(metric.attributeValueType);
+  text.append(", collectedOn: ");
+  times.append(text, metric.collectedOn);
+  text.append(", metricId: ").append(metric.metricId);
+  text.append(", subsId: ");
+  appendInteger(text, metric.subsId);
+  text.append(", graphable: ").append(boolText(metric.graphable));
+  text.append(", isBookmarked: ").append(boolText(metric.isBookmarked));
+  if (metric.sectionNumber) {
+    text.append(", sectionNumber: Optional(\"").append(*metric.sectionNumber).append("\"))");
+  } else {
+    text.append(", sectionNumber: nil)");
+  }
+}
+
+std::size_t sizeOfTexts(const Metric& metric) {
+  return metric.metricTech.size() + metric.metricName.size() + metric.attributeName.size() +
+         metric.attributeNameNonLocalized.size() + metric.attributeValue.size() + metric.attributeValueType.size() +
+         metric.metricId.size() + (metric.sectionNumber ? metric.sectionNumber->size() : 0);
+}
+
+}  // namespace
+
+void appendMetricText(std::string& text, const Metric& metric) {
+  UtcTextWriter times;
+  append(text, metric, times);
+}
+
+std::string exportText(const std::vector<Metric>& metrics) {
+  std::size_t size = 0;
+  for (const Metric& metric : metrics) size += kFixedSize + sizeOfTexts(metric);
+  std::string text;
+  text.reserve(size);
+  UtcTextWriter times;
+  for (const Metric& metric : metrics) {
+    if (!text.empty()) text.push_back(',');
+    append(text, metric, times);
+  }
+  return text;
+}
+
+}  // namespace quorl

@@ -1,0 +1,55 @@
+#include "screens/export/ExportView.h"
+
+#include <optional>
+#include <utility>
+#include <vector>
+
+#include "base/FatalStop.h"
+#include "base/Log.h"
+#include "platform/Platform.h"
+#include "screens/export/ExportText.h"
+#include "shell/LogCategories.h"
+#include "store/PersistanceStore.h"
+
+namespace quorl {
+namespace {
+
+constexpr Logger generalLog{log_category::kGeneral};
+
+const char* labelOf(AttributeDetailTimeFrame timeFrame) {
+  switch (timeFrame) {
+    case AttributeDetailTimeFrame::daily:
+      return "Daily";
+    case AttributeDetailTimeFrame::weekly:
+      return "Weekly";
+    case AttributeDetailTimeFrame::monthly:
+      return "Monthly";
+  }
+  fatalStop("AttributeDetailTimeFrame: no such case");
+}
+
+}  // namespace
+
+ExportView::ExportView(AttributeDetailTimeFrame timeFrame, std::weak_ptr<ExportViewDelegate> delegate)
+    : timeFrame_(timeFrame), labelText_(labelOf(timeFrame)), delegate_(std::move(delegate)) {}
+
+void ExportView::didTapExportButton() {
+  generalLog.log("Export View - didTapExportButton");
+  const auto screen = delegate_.lock();
+  if (!screen) return;
+  screen->loadingView().setLoadingLabelText("Gathering metrics from database");
+  screen->loadingView().show();
+  screen->persistanceStore()->exportMetrics(
+      timeFrame_, [delegate = delegate_](std::vector<Metric> metrics, std::optional<SQLiteError> error) {
+        if (error) {
+          generalLog.log("error  ---> %{public}s)", *error);  // the bracket is part of the line
+          return;
+        }
+        const auto alive = delegate.lock();
+        if (!alive) return;
+        alive->loadingView().hide();
+        Platform::current().share.share(exportText(metrics));
+      });
+}
+
+}  // namespace quorl

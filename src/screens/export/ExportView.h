@@ -1,0 +1,40 @@
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include "shell/LoadingView.h"
+#include "store/Metric.h"
+
+namespace quorl {
+
+class PersistanceStore;
+
+/// What a row of the export screen needs of it.
+class ExportViewDelegate {
+ public:
+  virtual ~ExportViewDelegate() = default;
+  virtual LoadingView& loadingView() = 0;
+  virtual const std::shared_ptr<PersistanceStore>& persistanceStore() const = 0;
+};
+
+/// One row of the export screen: a time frame that can be taken out. Main thread.
+class ExportView {
+ public:
+  ExportView(AttributeDetailTimeFrame timeFrame, std::weak_ptr<ExportViewDelegate> delegate);
+
+  /// "Daily", "Weekly" or "Monthly".
+  const std::string& labelText() const { return labelText_; }
+  AttributeDetailTimeFrame timeFrame() const { return timeFrame_; }
+
+  /// Gathers all rows of the time frame and hands them to the share facility as one text, made on the main thread.
+  /// After a failed read the loading view stays.
+  void didTapExportButton();
+
+ private:
+  const AttributeDetailTimeFrame timeFrame_;
+  const std::string labelText_;
+  const std::weak_ptr<ExportViewDelegate> delegate_;
+};
+
+}  // namespace quorl

@@ -1,0 +1,72 @@
+#include "screens/metricdetail/MetricDetailView.h"
+
+#include <limits>
+#include <utility>
+
+#include "shell/TimeTexts.h"
+
+namespace quorl {
+
+MetricDetailView::MetricDetailView(std::shared_ptr<MetricDetailViewModel> viewModel)
+    : viewModel_(std::move(viewModel)),
+      showToast_("copied"),
+      modelConnection_(viewModel_->onChange([this] { refresh(); })) {
+  refresh();
+}
+
+std::string MetricDetailView::lastSeenText() const {
+  return "Last seen on: " + timeText(viewModel_->collectedOn());
+}
+
+void MetricDetailView::refresh() {
+  CellsById earlier;
+  for (const Section& section : sections_)
+    for (const auto& cell : section.cells) earlier.emplace(cell->metricObject().id, cell);
+  sections_.clear();
+  for (const MetricSectional& sectional : viewModel_->metricSectionals())
+    sections_.push_back(makeSection("CA Status " + sectional.sectionName, sectional.sectionMetrics,
+                                    /*isSectioned=*/true, earlier));
+  if (sections_.empty())
+    sections_.push_back(makeSection(std::string(), viewModel_->metrics(), /*isSectioned=*/false, earlier));
+  changed_();
+}
+
+MetricDetailView::Section MetricDetailView::makeSection(std::string header, const std::vector<Metric>& rows,
+                                                        bool isSectioned, const CellsById& earlier) {
+  Section section{std::move(header), {}};
+  section.cells.reserve(rows.size());
+  for (const Metric& row : rows) {
+    const auto found = earlier.find(row.id);
+    section.cells.push_back(found == earlier.end() ? makeCell(row, isSectioned) : found->second);
+    section.cells.back()->update(row);
+  }
+  return section;
+}
+
+std::shared_ptr<MetricDetailsViewCell> MetricDetailView::makeCell(const Metric& row, bool isSectioned) {
+  MetricDetailsViewCell::Actions actions;
+  actions.graphableAction = [this, id = row.id, isSectioned] {
+    const Place place = placeOf(id, isSectioned);
+    viewProtocol_.showGraphForItemAt(*viewModel_, place.index, place.sectionIndex, isSectioned);
+  };
+  actions.bookMarkAction = [this, id = row.id, isSectioned](bool isBookmarked) {
+    const Place place = placeOf(id, isSectioned);
+    viewModel_->updateDashboardItem(place.index, isBookmarked, place.sectionIndex, isSectioned);
+  };
+  actions.onCopyAction = [this] { showToast_.show(); };
+  return std::make_shared<MetricDetailsViewCell>(row, std::move(actions));
+}
+
+MetricDetailView::Place MetricDetailView::placeOf(const Uuid& id, bool isSectioned) const {
+  const std::size_t sectionCount = isSectioned ? viewModel_->metricSectionals().size() : 1;
+  for (std::size_t sectionIndex = 0; sectionIndex < sectionCount; ++sectionIndex) {
+    for (std::size_t index = 0;; ++index) {
+      const Metric* metric = viewModel_->row(index, sectionIndex, isSectioned);
+      if (metric == nullptr) break;
+      if (metric->id == id) return {index, sectionIndex};
+    }
+  }
+  return {std::numeric_limits<std::size_t>::max(), 0};
+}
+
+}  // namespace quorl

@@ -1,0 +1,69 @@
+#pragma once
+
+#include <cstddef>
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "base/Signal.h"
+#include "screens/metricdetail/MetricDetailViewDelegate.h"
+#include "screens/metricdetail/MetricDetailViewModel.h"
+#include "screens/metricdetail/MetricDetailsViewCell.h"
+#include "shell/Toast.h"
+
+namespace quorl {
+
+/// What stands on the detail screen: texts, and rows with their state and intents. Main thread.
+class MetricDetailView {
+ public:
+  /// Rows under a header; a header of "" is none.
+  struct Section {
+    std::string header;
+    std::vector<std::shared_ptr<MetricDetailsViewCell>> cells;
+  };
+
+  explicit MetricDetailView(std::shared_ptr<MetricDetailViewModel> viewModel);
+  MetricDetailView(const MetricDetailView&) = delete;
+  MetricDetailView& operator=(const MetricDetailView&) = delete;
+
+  const std::shared_ptr<MetricDetailViewModel>& viewModel() const { return viewModel_; }
+  MetricDetailViewDelegate& viewProtocol() { return viewProtocol_; }
+
+  /// "Last seen on: " and a time.
+  std::string lastSeenText() const;
+  /// While true a spinner with the text "Loading..." stands in place of the rows.
+  bool showsSpinner() const { return viewModel_->shouldShowSPinner(); }
+  static constexpr char spinnerText[] = "Loading...";
+  /// The sections of "CA Status", or all rows in one section without a header.
+  const std::vector<Section>& sections() const { return sections_; }
+  /// "copied", after a long press on a row.
+  Toast& showToast() { return showToast_; }
+
+  /// Takes the model's state on show. A row that is still the same reading keeps its cell, and so what the user has
+  /// flipped in it.
+  void refresh();
+  /// `handler` runs after every change of a text, of the rows or of the spinner.
+  [[nodiscard]] Connection onChange(Signal<>::Handler handler) { return changed_.connect(std::move(handler)); }
+
+ private:
+  using CellsById = std::map<Uuid, std::shared_ptr<MetricDetailsViewCell>>;
+
+  Section makeSection(std::string header, const std::vector<Metric>& rows, bool isSectioned, const CellsById& earlier);
+  std::shared_ptr<MetricDetailsViewCell> makeCell(const Metric& row, bool isSectioned);
+  /// Where a row stands in the model now. An index that no row has when it is gone.
+  struct Place {
+    std::size_t index;
+    std::size_t sectionIndex;
+  };
+  Place placeOf(const Uuid& id, bool isSectioned) const;
+
+  const std::shared_ptr<MetricDetailViewModel> viewModel_;
+  MetricDetailViewDelegate viewProtocol_;
+  std::vector<Section> sections_;
+  Toast showToast_;
+  Signal<> changed_;
+  Connection modelConnection_;
+};
+
+}  // namespace quorl

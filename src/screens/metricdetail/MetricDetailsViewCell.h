@@ -1,0 +1,57 @@
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <string>
+
+#include "base/Signal.h"
+#include "store/Metric.h"
+
+namespace quorl {
+
+/// One row of the detail screen with its own view state. Main thread.
+class MetricDetailsViewCell {
+ public:
+  struct Actions {
+    std::function<void()> graphableAction;
+    std::function<void(bool isBookmarked)> bookMarkAction;
+    std::function<void()> onCopyAction;
+  };
+
+  MetricDetailsViewCell(Metric metricObject, Actions actions);
+  MetricDetailsViewCell(const MetricDetailsViewCell&) = delete;
+  MetricDetailsViewCell& operator=(const MetricDetailsViewCell&) = delete;
+
+  const Metric& metricObject() const { return metricObject_; }
+  /// The attribute's name as shown: "rsrp" for "0-section-rsrp".
+  std::string nameText() const;
+  /// The value as shown: "10 MHz" for a bandwidth of 50 resource blocks.
+  std::string valueText() const;
+
+  /// Only builds for engineers and carriers show graphs.
+  bool showsGraphSymbol() const;
+  static constexpr char graphSymbol[] = "arrow.right.circle";
+  /// Flips at the tap and stays so, whatever becomes of the statement.
+  bool isBookmarked() const { return isBookmarked_.get(); }
+  const char* bookmarkSymbol() const { return isBookmarked() ? "bookmark.fill" : "bookmark"; }
+
+  void tapGraph();
+  void tapBookmark();
+  /// Copies the value shown to the pasteboard.
+  void longPress();
+
+  /// Takes over what has become of the same reading, but not its bookmark once the user has flipped it here.
+  void update(const Metric& metric);
+  /// `handler` runs at once and whenever the bookmark flips.
+  [[nodiscard]] Connection onBookmarkChange(Published<bool>::Handler handler) {
+    return isBookmarked_.subscribe(std::move(handler));
+  }
+
+ private:
+  Metric metricObject_;
+  const Actions actions_;
+  Published<bool> isBookmarked_;
+  bool isFlippedByUser_ = false;
+};
+
+}  // namespace quorl

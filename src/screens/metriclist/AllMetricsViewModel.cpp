@@ -1,0 +1,133 @@
+#include "screens/metriclist/AllMetricsViewModel.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "app/HardwareManager.h"
+#include "base/Log.h"
+#include "platform/Platform.h"
+#include "shell/LogCategories.h"
+#include "shell/NotificationNames.h"
+
+namespace quorl {
+namespace {
+
+constexpr Logger allMetricsLog{log_category::kAllMetrics};
+
+constexpr char kTelephonyTech[] = "RAT";
+
+/// The telephony rows, which stand in the list whether they have been seen or not.
+AllMetricsDataSource telephonyGroup() {
+  const HardwareManager& hardware = HardwareManager::shared();
+  const Date now = Platform::current().clock.now();
+  AllMetricsDataSource group{kTelephonyTech, {{"Cell Info", now, hardware.currentSubsId()}}};
+  if (hardware.isInternalOrCarrierBuild()) {
+    group.rowItems.push_back({"Active Bands", now, hardware.currentSubsId()});
+    group.rowItems.push_back({"Supported Bands", now, hardware.currentSubsId()});
+  }
+  return group;
+}
+
+auto rowNamed(const AllMetricsDataSource& group, std::string_view metricName) {
+  return std::find_if(group.rowItems.begin(), group.rowItems.end(),
+                      [&](const AllMetricsRowItem& row) { return row.metricName == metricName; });
+}
+
+}  // namespace
+
+std::shared_ptr<AllMetricsViewModel> AllMetricsViewModel::make(std::shared_ptr<PersistanceStore> store) {
+  std::shared_ptr<AllMetricsViewModel> model(new AllMetricsViewModel(std::move(store)));
+  model->start();
+  return model;
+}
+
+void AllMetricsViewModel::start() {
+  persistanceStore_->setStoreDelegate(weak_from_this());
+  subscriptionObservation_ = NotificationCenter::defaultCenter().observe(
+      notification::kSubsIdSelectionChange, [weak = weak_from_this()](const Notification&) {
+        if (const auto self = weak.lock()) self->loadAndReload();
+      });
+  loadAndReload();
+}
+
+void AllMetricsViewModel::loadAndReload() {
+  load([weak = weak_from_this()](bool isReplaced, bool /*success*/) {
+    if (!isReplaced) return;
+    if (const auto self = weak.lock()) self->reloadScreen();
+  });
+}
+
+void AllMetricsViewModel::loadMetricList(LoadCompletion completion) {
+  load([completion = std::move(completion)](bool /*isReplaced*/, bool success) {
+    if (completion) completion(success);
+  });
+}
+
+void AllMetricsViewModel::load(ListCompletion completion) {
+  allMetricsLog.log("AllMetricsViewModel - loadMetricList ");
+  persistanceStore_->fetchAvailableMetrics(HardwareManager::shared().currentSubsId(),
+                                           [weak = weak_from_this(), completion = std::move(completion)](
+                                               AvailableMetrics available, std::optional<SQLiteError> error) {
+                                             if (const auto self = weak.lock())
+                                               self->fetchAvailableMetricsList(std::move(available), error, completion);
+                                           });
+}
+
+void AllMetricsViewModel::fetchAvailableMetricsList(AvailableMetrics available, const std::optional<SQLiteError>& error,
+                                                    const ListCompletion& completion) {
+  if (error) {
+    allMetricsLog.log("error occurred  ---> %{public}s", *error);
+    allMetricsLog.log("AllMetricsViewModel - fetchAvailableMetricsList error: %{public}s ", *error);
+    completion(/*isReplaced=*/false, /*success=*/false);
+    return;
+  }
+  available.erase(kTelephonyTech);  // the fixed rows stand for them
+  std::vector<AllMetricsDataSource> groups{telephonyGroup()};
+  groups.reserve(available.size() + 1);
+  for (auto& [metricTech, rows] : available) {  // the map's order is ascending
+    AllMetricsDataSource group{metricTech, {}};
+    group.rowItems.reserve(rows.size());
+    for (MetricList& row : rows) group.rowItems.push_back({std::move(row.metricName), row.collectedOn, row.subsId});
+    groups.push_back(std::move(group));
+  }
+  metricsList_ = std::move(groups);
+  allMetricsLog.log("AllMetricsViewModel - fetchAvailableMetricsList metricsList.count : %{public}d ",
+                    metricsList_.size());
+  completion(/*isReplaced=*/true, /*success=*/metricsList_.size() >= 2);
+}
+
+void AllMetricsViewModel::processNewMetric(const Metric& metric) {
+  allMetricsLog.log("AllMetricsViewModel - processNewMetric begins  tech %{public}s name: %{public}s",
+                    metric.metricTech, metric.metricName);
+  if (!isNewerThanItsRow(metric)) return;
+  loadMetricList([weak = weak_from_this()](bool success) {
+    const auto self = weak.lock();
+    if (!success || !self) return;
+    allMetricsLog.log("AllMetricsViewModel - processNewMetric isSectionNameExists");
+    self->reloadScreen();
+  });
+}
+
+bool AllMetricsViewModel::isSectionNameExists(std::string_view metricTech) const {
+  return std::any_of(metricsList_.begin(), metricsList_.end(),
+                     [&](const AllMetricsDataSource& group) { return group.metricTech == metricTech; });
+}
+
+bool AllMetricsViewModel::isNewerThanItsRow(const Metric& metric) const {
+  const bool isRowKnown = std::any_of(metricsList_.begin(), metricsList_.end(), [&](const AllMetricsDataSource& group) {
+    return rowNamed(group, metric.metricName) != group.rowItems.end();
+  });
+  if (!isRowKnown || !isSectionNameExists(metric.metricTech)) return true;
+  // The name may be known from another technology only; then there is nothing to compare with, and nothing to do.
+  return std::any_of(metricsList_.begin(), metricsList_.end(), [&](const AllMetricsDataSource& group) {
+    if (group.metricTech != metric.metricTech) return false;
+    const auto row = rowNamed(group, metric.metricName);
+    return row != group.rowItems.end() && row->timeStamp < metric.collectedOn;
+  });
+}
+
+void AllMetricsViewModel::reloadScreen() {
+  if (const auto delegate = delegate_.lock()) delegate->reloadMetricsList();
+}
+
+}  // namespace quorl
