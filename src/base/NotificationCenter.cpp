@@ -22,8 +22,8 @@ void NotificationCenter::resetDefaultCenter() {
 
 NotificationCenter::Observation NotificationCenter::observe(std::string_view name, Handler handler) {
   const std::lock_guard lock(mutex_);
-  auto found = signals_.find(name);
-  if (found == signals_.end()) found = signals_.emplace(std::string(name), std::make_shared<Signal>()).first;
+  auto found = observers_.find(name);
+  if (found == observers_.end()) found = observers_.emplace(std::string(name), std::make_shared<Observers>()).first;
   return found->second->connect(std::move(handler));
 }
 
@@ -32,14 +32,14 @@ void NotificationCenter::post(std::string_view name, Notification::UserInfo user
 }
 
 void NotificationCenter::post(const Notification& notification) {
-  std::shared_ptr<Signal> signal;
+  std::shared_ptr<Observers> observers;
   {
     const std::lock_guard lock(mutex_);
-    const auto found = signals_.find(notification.name);
-    if (found == signals_.end()) return;
-    signal = found->second;
+    const auto found = observers_.find(notification.name);
+    if (found == observers_.end()) return;
+    observers = found->second;
   }
-  (*signal)(notification);
+  (*observers)(notification);
 }
 
 }  // namespace quorl

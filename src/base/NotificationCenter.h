@@ -8,7 +8,7 @@
 #include <string>
 #include <string_view>
 
-#include <boost/signals2/signal.hpp>
+#include "base/Signal.h"
 
 namespace quorl {
 
@@ -32,8 +32,7 @@ struct Notification {
 class NotificationCenter {
  public:
   using Handler = std::function<void(const Notification&)>;
-  /// Ends the observation when it goes away. A handler that runs at that moment on another thread may still finish.
-  using Observation = boost::signals2::scoped_connection;
+  using Observation = Connection;
 
   /// The process-wide centre.
   static NotificationCenter& defaultCenter();
@@ -47,9 +46,9 @@ class NotificationCenter {
   void post(const Notification& notification);
 
  private:
-  using Signal = boost::signals2::signal<void(const Notification&)>;
+  using Observers = Signal<const Notification&>;
   std::mutex mutex_;
-  std::map<std::string, std::shared_ptr<Signal>, std::less<>> signals_;  // guarded by mutex_
+  std::map<std::string, std::shared_ptr<Observers>, std::less<>> observers_;  // guarded by mutex_
 };
 
 }  // namespace quorl

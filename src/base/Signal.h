@@ -1,26 +1,61 @@
 #pragma once
 
 #include <functional>
+#include <memory>
+#include <tuple>
 #include <utility>
-
-#include <boost/signals2/signal.hpp>
 
 namespace quorl {
 
-/// Ends a subscription when it goes away.
-using Connection = boost::signals2::scoped_connection;
+/// Ends a subscription when it goes away. A handler that runs at that moment on another thread may still finish.
+class Connection {
+ public:
+  Connection() = default;
+  explicit Connection(std::shared_ptr<void> subscription) : subscription_(std::move(subscription)) {}
+  Connection(Connection&&) noexcept = default;
+  Connection& operator=(Connection&&) noexcept = default;
+
+  void disconnect() { subscription_.reset(); }
+
+ private:
+  std::shared_ptr<void> subscription_;
+};
+
+/// The type-blind part of `Signal`, so that whoever includes this header does not compile the library behind it.
+class SignalCore {
+ public:
+  SignalCore();
+  ~SignalCore();
+  SignalCore(const SignalCore&) = delete;
+  SignalCore& operator=(const SignalCore&) = delete;
+
+  Connection connect(std::function<void(const void* arguments)> handler);
+  void emit(const void* arguments);
+
+ private:
+  struct Slots;
+  std::shared_ptr<Slots> slots_;
+};
 
 /// Tells whoever listens that something has happened. Handlers run inside the call, in the order of connection.
+/// Thread-safe.
 template <typename... Args>
 class Signal {
  public:
   using Handler = std::function<void(Args...)>;
 
-  [[nodiscard]] Connection connect(Handler handler) { return signal_.connect(std::move(handler)); }
-  void operator()(Args... args) { signal_(args...); }
+  [[nodiscard]] Connection connect(Handler handler) {
+    return core_.connect([handler = std::move(handler)](const void* arguments) {
+      std::apply(handler, *static_cast<const std::tuple<Args...>*>(arguments));
+    });
+  }
+  void operator()(Args... args) {
+    const std::tuple<Args...> arguments(args...);
+    core_.emit(&arguments);
+  }
 
  private:
-  boost::signals2::signal<void(Args...)> signal_;
+  SignalCore core_;
 };
 
 /// A value whose every assignment is told to its subscribers, equal or not. One thread.
@@ -52,7 +87,7 @@ class Published {
   void announce() { changed_(value_); }
 
   T value_;
-  boost::signals2::signal<void(const T&)> changed_;
+  Signal<const T&> changed_;
 };
 
 }  // namespace quorl

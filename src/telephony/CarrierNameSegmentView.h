@@ -8,8 +8,7 @@
 #include <string>
 #include <vector>
 
-#include <boost/signals2/signal.hpp>
-
+#include "base/Signal.h"
 #include "telephony/HorvaneViewModel.h"
 
 namespace quorl {
@@ -20,13 +19,11 @@ class SelectedTitle {
   const std::string& value() const { return value_; }
   /// Announces the change, also when the title stays the same.
   void set(std::string value);
-  [[nodiscard]] boost::signals2::scoped_connection observeChanges(std::function<void()> handler) {
-    return changed_.connect(handler);
-  }
+  [[nodiscard]] Connection observeChanges(std::function<void()> handler) { return changed_.connect(handler); }
 
  private:
   std::string value_;
-  boost::signals2::signal<void()> changed_;
+  Signal<> changed_;
 };
 
 /// One tab of the carrier bar: a capsule with a bold title. Main thread.
@@ -73,16 +70,14 @@ class CarrierNameSegmentView {
   /// A tab for each of the root's carriers as they are now, in order; none hides the bar's contents.
   std::vector<TabButton> tabButtons() const;
   /// `handler` runs when the tabs, or which of them are lit, may have changed.
-  [[nodiscard]] boost::signals2::scoped_connection observeChanges(std::function<void()> handler) {
-    return changed_.connect(handler);
-  }
+  [[nodiscard]] Connection observeChanges(std::function<void()> handler) { return changed_.connect(handler); }
 
  private:
   std::shared_ptr<HorvaneViewModel> root_;
   std::shared_ptr<SelectedTitle> tab_ = std::make_shared<SelectedTitle>();
-  boost::signals2::signal<void()> changed_;
-  boost::signals2::scoped_connection rootObservation_;
-  boost::signals2::scoped_connection tabObservation_;
+  Signal<> changed_;
+  Connection rootObservation_;
+  Connection tabObservation_;
 };
 
 }  // namespace quorl

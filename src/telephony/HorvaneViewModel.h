@@ -7,9 +7,8 @@
 #include <string>
 #include <vector>
 
-#include <boost/signals2/signal.hpp>
-
 #include "base/NotificationCenter.h"
+#include "base/Signal.h"
 #include "base/Uuid.h"
 #include "telephony/CarrierInfoObject.h"
 
@@ -21,7 +20,7 @@ class HorvaneViewModel {
  public:
   using Entries = std::vector<std::shared_ptr<const HorvaneViewModel>>;
   /// Ends the observation when it goes away.
-  using Observation = boost::signals2::scoped_connection;
+  using Observation = Connection;
 
   /// The root as the shell makes it: no name, no SIM, subscription 0.
   HorvaneViewModel() : HorvaneViewModel("", false, 0, Uuid::make()) {}
@@ -61,7 +60,7 @@ class HorvaneViewModel {
   const Uuid id_;
   std::map<std::string, std::int32_t, std::less<>> carrierCurrentSubsIdMap_;
   Entries carriers_;
-  boost::signals2::signal<void()> changed_;
+  Signal<> changed_;
 };
 
 /// What the shell does on "carrierUpdate": brings `root` up to date with the notification's carriers. A notification
