@@ -1,0 +1,204 @@
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+#include "base/DateText.h"
+#include "store/DBManager.h"
+#include "store/MetricStatements.h"
+#include "store/RawDatabase.h"
+#include "support/FakePlatform.h"
+#include "support/LogRecorder.h"
+#include "support/TimeZone.h"
+#include "support/VirtualTimeVfs.h"
+
+namespace quorl::test {
+
+/// On which queue a completion ran.
+enum class Place { none, main, database };
+
+/// What a completion was told; one call is expected.
+template <typename Result>
+struct Outcome {
+  int calls = 0;
+  Result result{};
+  std::optional<SQLiteError> error;
+  Place place = Place::none;
+};
+
+using Written = Outcome<bool>;
+using Read = Outcome<std::vector<Metric>>;
+using Listed = Outcome<AvailableMetrics>;
+using Pinned = Outcome<std::vector<DashboardTableItem>>;
+
+inline SQLiteError prepareError(std::string message) {
+  return {SQLiteError::Case::Prepare, std::move(message)};
+}
+inline SQLiteError emptyQueryResult() {
+  return {SQLiteError::Case::EmptyQueryResult, {}};
+}
+
+/// A real database file under a fake platform. The clock, SQLite's included, stands at 2026-01-05 09:30:12 UTC, and
+/// the zone is UTC unless a test says otherwise.
+class DatabaseFixture : public testing::Test {
+ protected:
+  FakePlatform platform;
+  VirtualTimeVfs vfs{platform.time};
+  LogRecorder log;
+  std::optional<ScopedTimeZone> zone{std::in_place, "UTC"};
+  std::shared_ptr<SQLiteDatabase> database;
+
+  std::string path() const { return (platform.directory.path() / "metricPartV11.sqlite").string(); }
+
+  void open() {
+    auto opened = SQLiteDatabase::open(path());
+    ASSERT_TRUE(opened.has_value());
+    database = *opened;
+  }
+  void openWithTables() {
+    open();
+    run(SQLTable<Metric>::createMetricTable);
+    run(SQLTable<Metric>::createDashboardTable);
+  }
+  void inZone(std::string_view name) {
+    zone.reset();
+    zone.emplace(name);
+  }
+  void setClock(std::string_view utc) { platform.time.setNow(utcDate(utc)); }
+  static Date utcDate(std::string_view text) {
+    const ScopedTimeZone utcZone("UTC");
+    return parseWallClock(text).value();
+  }
+
+  /// On the product's own connection, past its queue.
+  std::vector<Row> run(const std::string& sql) { return test::run(database->dbPointer(), sql); }
+
+  Place place() const {
+    if (platform.mainQueue->isCurrent()) return Place::main;
+    return database && database->queue().isCurrent() ? Place::database : Place::none;
+  }
+  template <typename Result>
+  auto into(Outcome<Result>& outcome) {
+    return [this, &outcome](Result result, std::optional<SQLiteError> error) {
+      ++outcome.calls;
+      outcome.result = std::move(result);
+      outcome.error = std::move(error);
+      outcome.place = place();
+    };
+  }
+
+  /// A reading of the serving cell; tests change what matters to them.
+  static Metric reading(std::string attribute = "dl_freq", std::string value = "5230",
+                        std::string_view collectedOn = "2026-01-05 09:00:00", std::int32_t subsId = 0) {
+    Metric metric;
+    metric.id = Uuid::make();
+    metric.metricTech = "LTE";
+    metric.metricName = "Serving Cell Info";
+    metric.attributeName = std::move(attribute);
+    metric.attributeNameNonLocalized = metric.attributeName;
+    metric.attributeValue = std::move(value);
+    metric.attributeValueType = "INT";
+    metric.collectedOn = parseWallClock(collectedOn).value();
+    metric.metricId = "803010";
+    metric.subsId = subsId;
+    return metric;
+  }
+
+  Written createTable(const std::string& sql, const std::string& name) {
+    Written outcome;
+    database->createTable(sql, name, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+  Written insert(const Metric& metric) {
+    Written outcome;
+    database->insertMetric(metric, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+  Written deleteOlderRows() {
+    Written outcome;
+    database->deleteOlderRows([this, &outcome](bool success) {
+      ++outcome.calls;
+      outcome.result = success;
+      outcome.place = place();
+    });
+    platform.time.settle();
+    return outcome;
+  }
+  Written execute(const std::string& sql) {
+    Written outcome;
+    database->executeDashboardStatement(sql, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+  Written pin(const Metric& metric) {
+    return execute(SQLTable<Metric>::pinAttribute(metric.metricTech, metric.attributeNameNonLocalized, metric.subsId));
+  }
+  Written unpin(std::string_view tech, std::string_view attribute, std::int32_t subsId) {
+    Written outcome;
+    database->removeDashboardItem(tech, attribute, subsId, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+  Listed available(std::int32_t subsId = 0) {
+    Listed outcome;
+    database->fetchAvailableMetrics(subsId, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+  Read contents(std::optional<std::string_view> attribute = std::nullopt, std::int32_t subsId = 0,
+                std::string_view tech = "LTE", std::string_view name = "Serving Cell Info") {
+    Read outcome;
+    database->fetchMetricContents(tech, name, attribute, subsId, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+  Read history(AttributeDetailTimeFrame timeFrame, std::string_view attribute = "dl_freq",
+               std::string_view name = "Serving Cell Info") {
+    Read outcome;
+    database->fetchAttributeHistory(name, attribute, timeFrame, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+  Pinned dashboard(std::int32_t subsId = 0) {
+    Pinned outcome;
+    database->fetchDashboard(subsId, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+  Read exported(AttributeDetailTimeFrame timeFrame) {
+    Read outcome;
+    database->exportMetrics(timeFrame, into(outcome));
+    platform.time.settle();
+    return outcome;
+  }
+
+  /// How many statements the connection still holds.
+  int openStatements() const {
+    int count = 0;
+    for (sqlite3_stmt* at = nullptr; (at = sqlite3_next_stmt(database->dbPointer(), at)) != nullptr;) ++count;
+    return count;
+  }
+};
+
+inline std::vector<std::string> values(const std::vector<Metric>& metrics) {
+  std::vector<std::string> result;
+  for (const Metric& metric : metrics) result.push_back(metric.attributeValue);
+  return result;
+}
+
+inline std::vector<std::string> times(const std::vector<Metric>& metrics) {
+  std::vector<std::string> result;
+  for (const Metric& metric : metrics) result.push_back(wallClockText(metric.collectedOn));
+  return result;
+}
+
+}  // namespace quorl::test
