@@ -19,13 +19,6 @@ SharedBytes::SharedBytes(std::string_view bytes) {
   owned_ = true;
 }
 
-SharedBytes SharedBytes::fromLiteral(std::string_view literal) noexcept {
-  SharedBytes result;
-  result.data_ = literal.data();
-  result.size_ = static_cast<std::uint32_t>(literal.size());
-  return result;
-}
-
 SharedBytes::Header* SharedBytes::header() const noexcept {
   return reinterpret_cast<Header*>(const_cast<char*>(data_) - sizeof(Header));
 }

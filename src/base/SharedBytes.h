@@ -32,7 +32,12 @@ class SharedBytes {
   ~SharedBytes() { release(); }
 
   /// `literal` must outlive every copy: string literals and generated constant tables.
-  static SharedBytes fromLiteral(std::string_view literal) noexcept;
+  static SharedBytes fromLiteral(std::string_view literal) noexcept {
+    SharedBytes result;
+    result.data_ = literal.data();
+    result.size_ = static_cast<std::uint32_t>(literal.size());
+    return result;
+  }
 
   const char* data() const noexcept { return data_; }
   std::size_t size() const noexcept { return size_; }

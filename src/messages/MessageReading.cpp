@@ -30,6 +30,24 @@ bool readList(WireReader& reader, ListRecord<T>& list, std::uint64_t wireType, R
   return true;
 }
 
+bool isScalar(FieldKind kind) {
+  return kind <= FieldKind::Bool;
+}
+
+/// Stores a varint in the member of a scalar field.
+void storeScalar(MetricCodable& message, const FieldEntry& field, std::uint64_t value) {
+  if (field.kind <= FieldKind::SInt32) {
+    // One store for all kinds of 32 bits; enumerations keep a value that they do not have.
+    const auto low = static_cast<std::uint32_t>(value);
+    const auto zigZag = static_cast<std::uint32_t>(WireReader::decodeZigZag(low));
+    member<std::uint32_t>(message, field.offset) = field.kind == FieldKind::SInt32 ? zigZag : low;
+  } else if (field.kind == FieldKind::UInt64) {
+    member<std::uint64_t>(message, field.offset) = value;
+  } else {
+    member<bool>(message, field.offset) = value != 0;
+  }
+}
+
 }  // namespace
 
 void MetricCodable::initWithData(const std::optional<ByteString>& payload) {
@@ -45,11 +63,17 @@ bool MetricCodable::readFields(WireReader& reader, const MessageTable& table) {
   bool canGoOn = true;
   while (reader.pos < reader.length) {
     if (reader.error) break;
-    const std::uint64_t key = reader.readVarint();
+    const std::uint64_t key = reader.readKey();
     const std::uint64_t wireType = key & 7U;
     if (reader.error || wireType == kEndGroup) break;
     const auto tag = static_cast<std::uint32_t>(key >> 3U);
-    if (const FieldEntry* field = table.find(tag)) {
+    const FieldEntry* field = table.find(tag);
+    // The wire type is not compared with the field's.
+    if (field != nullptr && isScalar(field->kind)) {
+      // First the flag: a scalar counts as present even if its value cannot be read.
+      setFlag(*this, *field);
+      storeScalar(*this, *field, reader.readVarint());
+    } else if (field != nullptr) {
       canGoOn = readField(reader, *field, wireType);
     } else if (!table.acceptsMetricIdTags && KBBMetricUtility::isValidMetricIdTag(tag, table)) {
       const auto value = static_cast<std::uint32_t>(reader.readVarint());
@@ -65,30 +89,15 @@ bool MetricCodable::readFields(WireReader& reader, const MessageTable& table) {
 }
 
 bool MetricCodable::readField(WireReader& reader, const FieldEntry& field, std::uint64_t wireType) {
-  // The wire type is not compared with the field's. A scalar counts as present even if its value cannot be read.
   const std::size_t offset = field.offset;
   switch (field.kind) {
     case FieldKind::UInt32:
-      setFlag(*this, field);
-      member<std::uint32_t>(*this, offset) = static_cast<std::uint32_t>(reader.readVarint());
-      return true;
-    case FieldKind::UInt64:
-      setFlag(*this, field);
-      member<std::uint64_t>(*this, offset) = reader.readVarint();
-      return true;
     case FieldKind::Int32:
     case FieldKind::Enumeration:
-      setFlag(*this, field);
-      member<std::int32_t>(*this, offset) = static_cast<std::int32_t>(reader.readVarint());
-      return true;
     case FieldKind::SInt32:
-      setFlag(*this, field);
-      member<std::int32_t>(*this, offset) = reader.readZigZag32();
-      return true;
+    case FieldKind::UInt64:
     case FieldKind::Bool:
-      setFlag(*this, field);
-      member<bool>(*this, offset) = reader.readVarint() != 0;
-      return true;
+      break;  // read in place by the loop
     case FieldKind::Bytes:
       member<std::optional<ByteString>>(*this, offset) = reader.readBytes();
       return true;

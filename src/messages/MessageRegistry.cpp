@@ -1,6 +1,6 @@
-#include <algorithm>
 #include <memory>
 #include <string_view>
+#include <unordered_map>
 
 #include "messages/MessageTable.h"
 #include "messages/MetricCodable.h"
@@ -8,12 +8,13 @@
 namespace quorl {
 
 std::unique_ptr<MetricCodable> makeMessage(std::string_view className) {
-  const auto tables = allMessageTables();
-  const auto found =
-      std::lower_bound(tables.begin(), tables.end(), className,
-                       [](const MessageTable* table, std::string_view name) { return table->className < name; });
-  if (found == tables.end() || (*found)->className != className) return nullptr;
-  return std::unique_ptr<MetricCodable>((*found)->make());
+  static const auto tables = [] {
+    std::unordered_map<std::string_view, const MessageTable*> byName;
+    for (const MessageTable* table : allMessageTables()) byName.emplace(table->className, table);
+    return byName;
+  }();
+  const auto found = tables.find(className);
+  return std::unique_ptr<MetricCodable>(found == tables.end() ? nullptr : found->second->make());
 }
 
 }  // namespace quorl

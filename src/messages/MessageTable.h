@@ -14,12 +14,13 @@ struct MessageTable;
 
 /// How a field is stored, read and written.
 enum class FieldKind : std::uint8_t {
+  // Those of 32 bits first, then the other scalars: the reader tells them by their order.
   UInt32,
-  UInt64,
   Int32,
-  SInt32,
-  Bool,
   Enumeration,
+  SInt32,
+  UInt64,
+  Bool,
   Bytes,
   String,
   Message,
@@ -37,12 +38,20 @@ struct EnumTable {
   };
 
   /// The enumerator's name, or "(unknown: %i)" with the value for an integer that is not a value of the enumeration.
-  Text name(std::int32_t value) const;
+  Text name(std::int32_t value) const {
+    // Most enumerations have no gap, so that the value itself tells the place.
+    const auto place = static_cast<std::size_t>(std::int64_t{value} - entries.front().value);
+    if (place < entries.size() && entries[place].value == value) return Text::fromLiteral(entries[place].name);
+    return nameBySearch(value);
+  }
   /// The enumerator's value; the default for a name that is not in the enumeration.
   std::int32_t value(std::string_view name) const;
 
   std::span<const Entry> entries;  // ascending by value
   std::int32_t defaultValue;
+
+ private:
+  Text nameBySearch(std::int32_t value) const;
 };
 
 /// One field of a message class. Offsets are those of the members from the beginning of the message.
@@ -66,8 +75,12 @@ struct MessageTable {
     return index == 0 ? nullptr : &fields[index - 1];
   }
 
+  std::size_t flagWords() const { return (flagCount + 31U) / 32U; }
+
   std::string_view className;
   std::span<const FieldEntry> fields;
+  std::uint16_t flagOffset;  // of the words of presence flags, which stand in a row
+  std::uint16_t flagCount;
   std::span<const std::uint8_t> indexByTag;  // index in `fields` plus one; 0 for a tag of no field
   bool acceptsMetricIdTags;                  // the reader does not refuse tags that are metric ids
   MetricCodable* (*make)();

@@ -36,6 +36,15 @@ bool isAbsentScalar(const MetricCodable& message, const FieldEntry& field) {
   return field.flag != 0 && !hasFlag(message, field);
 }
 
+/// The number of present scalars and of all other fields.
+std::size_t countPossibleEntries(const MetricCodable& message, const MessageTable& table) {
+  std::size_t count = table.fields.size() - table.flagCount;
+  for (std::size_t i = 0; i < table.flagWords(); ++i)
+    count += static_cast<std::size_t>(
+        std::popcount(member<std::uint32_t>(message, table.flagOffset + i * sizeof(std::uint32_t))));
+  return count;
+}
+
 }  // namespace
 
 void MetricCodable::writeTo(WireWriter& writer) const {
@@ -99,7 +108,7 @@ std::optional<MetricDictionary> MetricCodable::dictionaryRepresentation() const 
 }
 
 void MetricCodable::represent(MetricDictionary& dictionary, const MessageTable& table) const {
-  dictionary.reserve(table.fields.size());
+  dictionary.reserve(countPossibleEntries(*this, table));
   for (const FieldEntry& field : table.fields) {
     if (isAbsentScalar(*this, field)) continue;
     const std::size_t offset = field.offset;

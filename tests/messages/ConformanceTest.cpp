@@ -5,6 +5,7 @@
 #include <random>
 #include <string>
 
+#include <google/protobuf/stubs/logging.h>
 #include <google/protobuf/unknown_field_set.h>
 #include <google/protobuf/util/message_differencer.h>
 #include <gtest/gtest.h>
@@ -112,6 +113,8 @@ TEST_P(ConformanceTest, UnknownFieldsOfEveryWireTypeAreLeftOut) {
 }
 
 TEST_P(ConformanceTest, TruncatedPayloadsAreRefusedWhereLibprotobufRefusesThem) {
+  // A debug build of libprotobuf's classes complains of each text that was cut within a character.
+  const google::protobuf::LogSilencer silencer;
   for (int round = 0; round < 4; ++round) {
     const auto message = protobufMessage();
     fill(*message, round);

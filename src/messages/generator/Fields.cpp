@@ -13,8 +13,6 @@ using google::protobuf::FieldDescriptor;
 
 namespace {
 
-constexpr int kFlagsPerWord = 32;
-
 // The base class's own names, and the C++ keywords that a camel-cased key could be.
 constexpr std::array<std::string_view, 53> kTakenNames = {
     "table",    "initWithData", "isReadWhole", "readFrom", "writeTo",      "dictionaryRepresentation",
@@ -120,7 +118,7 @@ std::vector<Message> messagesOf(const google::protobuf::FileDescriptor& file) {
       if (!field.scalarType.empty() && !field.isRepeated()) field.flagIndex = flags++;
       message.fields.push_back(std::move(field));
     }
-    message.flagWords = static_cast<std::size_t>((flags + kFlagsPerWord - 1) / kFlagsPerWord);
+    message.flagCount = static_cast<std::size_t>(flags);
     messages.push_back(std::move(message));
   }
   return messages;

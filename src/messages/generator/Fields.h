@@ -33,7 +33,9 @@ struct Field {
 struct Message {
   const google::protobuf::Descriptor* descriptor;
   std::vector<Field> fields;  // in the order of the table
-  std::size_t flagWords = 0;
+  std::size_t flagCount = 0;
+
+  std::size_t flagWords() const { return (flagCount + 31) / 32; }
 
   const std::string& name() const { return descriptor->name(); }
 };

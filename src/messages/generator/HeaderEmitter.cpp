@@ -122,7 +122,7 @@ void emitMembers(Output& out, const Message& message) {
   };
   auto field = fields.begin();
   for (; field != fields.end() && (*field)->alignment == 8; ++field) emitMember(**field);
-  if (message.flagWords > 0) emit(out, "  std::uint32_t has_[{}] = {{}};\n", message.flagWords);
+  if (message.flagCount > 0) emit(out, "  std::uint32_t has_[{}] = {{}};\n", message.flagWords());
   for (; field != fields.end(); ++field) emitMember(**field);
 }
 

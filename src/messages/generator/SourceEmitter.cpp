@@ -68,8 +68,10 @@ void emitMessage(Output& out, const Message& message) {
   for (const Field& field : message.fields) emitFieldEntry(out, field);
   emit(out, "  }};\n");
   emitIndexByTag(out, message);
+  if (message.flagCount > 0) emit(out, "  static constexpr std::uint16_t kFlagOffset = offsetof(Self, has_);\n");
   emit(out, "}};\n\n");
-  emit(out, "constinit const MessageTable {}::kTable{{\"{}\", Fields::kEntries, Fields::kIndexByTag, {},\n", name, name,
+  emit(out, "constinit const MessageTable {}::kTable{{\"{}\", Fields::kEntries, {}, {}, Fields::kIndexByTag, {},\n",
+       name, name, message.flagCount > 0 ? "Fields::kFlagOffset" : "0", message.flagCount,
        message.descriptor->options().GetExtension(schema::accepts_metric_id_tags));
   emit(out, "    []() -> MetricCodable* {{ return new {}; }}}};\n\n", name);
   emit(out, "{}::{}() = default;\n{}::~{}() = default;\n", name, name, name, name);

@@ -41,22 +41,9 @@ std::string repaired(std::string_view text) {
 
 }  // namespace
 
-std::uint64_t WireReader::readLongVarint() {
+std::uint64_t WireReader::readVarintByByte() {
   std::uint64_t value = 0;
   unsigned shift = 0;
-  if (length >= kMaxVarintBytes && pos <= length - kMaxVarintBytes && !error) {
-    const std::uint8_t* at = bytes + pos;
-    for (int i = 0; i < kMaxVarintBytes; ++i, shift += 7) {
-      const std::uint8_t byte = at[i];
-      value |= static_cast<std::uint64_t>(byte & 0x7FU) << shift;
-      if (byte < 0x80) {
-        pos += static_cast<std::uint64_t>(i) + 1;
-        return value;
-      }
-    }
-    pos += kMaxVarintBytes;
-    return 0;
-  }
   for (int i = 0; i < kMaxVarintBytes; ++i, shift += 7) {
     std::uint8_t byte = 0;
     if (pos >= length)
@@ -113,7 +100,7 @@ bool WireReader::skipValue(std::uint32_t tag, std::uint32_t wireType) {
 bool WireReader::skipGroup(std::uint32_t tag, int depth) {
   if (depth > kMaxGroupDepth) return false;
   while (pos < length) {
-    const std::uint64_t key = readVarint();
+    const std::uint64_t key = readKey();
     if (error) return false;
     const auto innerTag = static_cast<std::uint32_t>(key >> 3U);
     const auto wireType = static_cast<std::uint32_t>(key & 7U);
