@@ -6,7 +6,6 @@
 #include <iostream>
 #include <iterator>
 #include <map>
-#include <regex>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -51,14 +50,24 @@ bool isComment(const std::string& line) {
 }
 
 /// The line without our own options; nothing is left of a line that held nothing else.
-std::string withoutOwnOptions(const std::string& line) {
-  static const std::regex ownStatement(R"(^\s*option \(quorl\.schema\.\w+\) = .*;$)");
-  static const std::regex ownList(R"( \[\(quorl\.schema\.\w+\) = "\w+"\])");
-  static const std::regex ownEntry(R"((, )?\(quorl\.schema\.\w+\) = "\w+")");
-  static const std::regex gapBeforeComment(R"(; +//)");
-  if (std::regex_match(line, ownStatement)) return {};
-  std::string plain = std::regex_replace(std::regex_replace(line, ownList, ""), ownEntry, "");
-  return plain == line ? plain : std::regex_replace(plain, gapBeforeComment, ";  //");
+std::string withoutOwnOptions(std::string line) {
+  constexpr std::string_view kOwnOption = "(quorl.schema.";
+  const std::size_t begin = line.find(kOwnOption);
+  if (begin == std::string::npos) return line;
+  if (line.find("option " + std::string(kOwnOption)) != std::string::npos) return {};
+  // Of a field's options ours is a text, and the last one.
+  line.erase(begin, line.find(']', begin) - begin);
+  constexpr std::string_view kNothingElse = " []";
+  constexpr std::string_view kComma = ", ";
+  if (const std::size_t empty = line.find(kNothingElse); empty != std::string::npos) {
+    line.erase(empty, kNothingElse.size());
+  } else {
+    line.erase(begin - kComma.size(), kComma.size());
+  }
+  // The comment behind it stood in a column with those of other lines.
+  const std::size_t comment = line.find("//");
+  if (comment != std::string::npos) line.replace(line.find(';') + 1, comment - line.find(';') - 1, "  ");
+  return line;
 }
 
 /// A definition as its file has it, from its comment to its closing brace.
