@@ -27,4 +27,13 @@ void addSchema(CLI::App& tool, Action& chosen);
 void addSummary(CLI::App& tool, Action& chosen);
 void addMakeRecording(CLI::App& tool, Action& chosen);
 
+// On a database that replay made, by what the screens compute.
+void addMetrics(CLI::App& tool, Action& chosen);
+void addShow(CLI::App& tool, Action& chosen);
+void addDashboard(CLI::App& tool, Action& chosen);
+void addPin(CLI::App& tool, Action& chosen);
+void addUnpin(CLI::App& tool, Action& chosen);
+void addHistory(CLI::App& tool, Action& chosen);
+void addExport(CLI::App& tool, Action& chosen);
+
 }  // namespace quorl::tool

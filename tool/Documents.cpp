@@ -102,12 +102,35 @@ tl::expected<void, std::string> foldWriteAheadLog(const fs::path& documents) {
   return {};
 }
 
-tl::expected<std::vector<MetricSummary>, std::string> summarize(const fs::path& documents) {
-  const fs::path file = databaseFile(documents);
+namespace {
+
+/// Opens a database that is there already.
+tl::expected<Database, std::string> openExisting(const fs::path& file) {
   std::error_code ignored;
   if (!fs::exists(file, ignored)) return cannotUse(file, "No such file or directory");
   auto database = Database::open(file, SQLITE_OPEN_READWRITE);
   if (!database) return cannotUse(file, database.error());
+  return database;
+}
+
+}  // namespace
+
+tl::expected<std::string, std::string> basebandFamily(const fs::path& documents) {
+  constexpr std::int64_t kLeastIceId = 3900000;
+  const fs::path file = databaseFile(documents);
+  const auto database = openExisting(file);
+  if (!database) return tl::unexpected(database.error());
+  bool isIce = false;
+  const auto read = database->run("SELECT CAST(metric_id AS INTEGER) FROM Metric WHERE metric_id GLOB '[0-9]*' LIMIT 1",
+                                  [&isIce](sqlite3_stmt* row) { isIce = sqlite3_column_int64(row, 0) >= kLeastIceId; });
+  if (!read) return cannotUse(file, read.error());
+  return isIce ? "ice" : "mav";
+}
+
+tl::expected<std::vector<MetricSummary>, std::string> summarize(const fs::path& documents) {
+  const fs::path file = databaseFile(documents);
+  const auto database = openExisting(file);
+  if (!database) return tl::unexpected(database.error());
   std::vector<MetricSummary> metrics;
   const auto read = database->run(
       "SELECT metric_tech, metric_name, count(*), max(collected_on) FROM Metric"

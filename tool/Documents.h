@@ -20,6 +20,9 @@ tl::expected<void, std::string> prepareDocuments(const std::filesystem::path& do
 /// Writes everything that is still in the write-ahead log into the database file, so that the file alone is whole.
 tl::expected<void, std::string> foldWriteAheadLog(const std::filesystem::path& documents);
 
+/// The baseband family whose metrics a database holds, "mav" or "ice", as the metric ids tell; "mav" if they do not.
+tl::expected<std::string, std::string> basebandFamily(const std::filesystem::path& documents);
+
 /// What a store holds of one metric.
 struct MetricSummary {
   std::string tech;

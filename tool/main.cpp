@@ -37,6 +37,13 @@ int main(int argc, char** argv) {
   Action chosen;
   addReplay(tool, chosen);
   addSummary(tool, chosen);
+  addMetrics(tool, chosen);
+  addShow(tool, chosen);
+  addDashboard(tool, chosen);
+  addPin(tool, chosen);
+  addUnpin(tool, chosen);
+  addHistory(tool, chosen);
+  addExport(tool, chosen);
   addDecode(tool, chosen);
   addEncode(tool, chosen);
   addCatalogue(tool, chosen);

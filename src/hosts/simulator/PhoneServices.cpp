@@ -85,6 +85,7 @@ std::string GettextStrings::localized(std::string_view key) {
 }
 
 void StandardErrorConsole::print(std::string_view line) {
+  if (!isShown_) return;
   std::string whole(line);
   whole.push_back('\n');
   std::fwrite(whole.data(), 1, whole.size(), stderr);

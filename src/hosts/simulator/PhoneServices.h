@@ -68,7 +68,12 @@ class GettextStrings final : public StringTable {
 /// Standard error: standard output belongs to a program's results.
 class StandardErrorConsole final : public Console {
  public:
+  /// One that is not shown prints nothing.
+  explicit StandardErrorConsole(bool isShown = true) : isShown_(isShown) {}
   void print(std::string_view line) override;
+
+ private:
+  const bool isShown_;
 };
 
 /// Prints a dialog and presses its button, once what is at hand has ended.

@@ -14,7 +14,8 @@ SimulatedPhone::SimulatedPhone(Options options)
       resources_(options.resources),
       documents_(std::move(options.documents)),
       strings_(options.resources),
-      alerts_(console_, mainQueue_),
+      console_(options.isConsoleShown),
+      alerts_(alertConsole_, mainQueue_),
       telephony_(queues_),
       platform_{mainQueue_, *backgroundQueue_, queues_,    clock_, device_,     resources_, documents_, strings_,
                 console_,   alerts_,           analytics_, share_, pasteboard_, baseband_,  telephony_} {

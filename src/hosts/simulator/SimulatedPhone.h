@@ -24,6 +24,7 @@ class SimulatedPhone {
     DeviceDescription device;
     std::filesystem::path documents;
     std::vector<std::filesystem::path> resources;
+    bool isConsoleShown = true;  // what the product prints; dialogs are shown in any case
   };
 
   /// Installs itself as the process's platform.
@@ -55,6 +56,7 @@ class SimulatedPhone {
   FixedDocumentsDirectory documents_;
   GettextStrings strings_;
   StandardErrorConsole console_;
+  StandardErrorConsole alertConsole_;
   PrintedAlerts alerts_;
   LoggedAnalytics analytics_;
   KeptShare share_;

@@ -1,0 +1,79 @@
+#include <cerrno>
+#include <iostream>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <system_error>
+
+#include <fcntl.h>
+#include <fmt/format.h>
+#include <unistd.h>
+
+#include "Commands.h"
+#include "StoreSession.h"
+#include "TimeFrameOption.h"
+#include "screens/export/ExportViewController.h"
+
+namespace quorl::tool {
+namespace {
+
+struct Options {
+  StoreOptions store;
+  AttributeDetailTimeFrame timeFrame = AttributeDetailTimeFrame::daily;
+  std::string output;  // empty: standard output
+};
+
+bool writeAll(int file, std::string_view text) {
+  while (!text.empty()) {
+    const ssize_t written = write(file, text.data(), text.size());
+    if (written < 0 && errno == EINTR) continue;
+    if (written < 0) return false;
+    text.remove_prefix(static_cast<std::size_t>(written));
+  }
+  return true;
+}
+
+/// Rows hold cell identities, so a new file is for its owner alone.
+int writeFile(const std::string& path, std::string_view text) {
+  const int file = open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0600);
+  bool isWritten = file >= 0 && writeAll(file, text);
+  const int error = errno;
+  if (file >= 0 && close(file) != 0) isWritten = false;
+  if (isWritten) return kSuccess;
+  complain(fmt::format("{}: {}", path, std::generic_category().message(error)));
+  return kFailure;
+}
+
+int exportRows(StoreSession& session, const Options& options) {
+  const auto screen = ExportViewController::make(session.store());
+  for (ExportView& row : screen->containerView())
+    if (row.timeFrame() == options.timeFrame) row.didTapExportButton();
+  session.settle();
+  const std::optional<std::string>& text = session.phone().share().text();
+  if (!text) {
+    complain("the rows cannot be read (see --verbose)");
+    return kFailure;
+  }
+  if (!options.output.empty()) return writeFile(options.output, *text);
+  std::cout.write(text->data(), static_cast<std::streamsize>(text->size()));
+  return kSuccess;
+}
+
+}  // namespace
+
+void addExport(CLI::App& tool, Action& chosen) {
+  auto* command =
+      tool.add_subcommand("export", "Print all stored rows of a time frame, as the export screen shares them");
+  command->footer("The text has no line break, not even at its end, and mixes both subscriptions.");
+  auto options = std::make_shared<Options>();
+  addTimeFrameOption(*command, options->timeFrame);
+  command->add_option("--output", options->output, "File to write to instead of standard output");
+  addStoreOptions(*command, options->store, /*isTable=*/false);
+  command->callback([&chosen, options] {
+    chosen = [options] {
+      return withStore(options->store, [&](StoreSession& session) { return exportRows(session, *options); });
+    };
+  });
+}
+
+}  // namespace quorl::tool

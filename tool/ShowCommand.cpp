@@ -1,0 +1,84 @@
+#include <iostream>
+#include <memory>
+#include <string>
+
+#include <fmt/format.h>
+
+#include "Commands.h"
+#include "MessageJson.h"
+#include "StoreSession.h"
+#include "TextTable.h"
+#include "base/DateText.h"
+#include "screens/metricdetail/MetricDetailsViewController.h"
+
+namespace quorl::tool {
+namespace {
+
+struct Options {
+  StoreOptions store;
+  std::string tech;
+  std::string metric;
+};
+
+void printTable(MetricDetailView& view) {
+  std::cout << view.lastSeenText() << '\n';
+  for (const MetricDetailView::Section& section : view.sections()) {
+    std::cout << '\n';
+    if (!section.header.empty()) std::cout << section.header << '\n';
+    TextTable table({"Attribute", "Value", "Pinned", "Graph"});
+    for (const auto& cell : section.cells)
+      table.add({cell->nameText(), cell->valueText(), cell->isBookmarked() ? "yes" : "",
+                 cell->showsGraphSymbol() ? "yes" : ""});
+    table.print(std::cout);
+  }
+}
+
+void printJson(MetricDetailView& view) {
+  for (const MetricDetailView::Section& section : view.sections()) {
+    for (const auto& cell : section.cells) {
+      const Metric& row = cell->metricObject();
+      Json line;
+      if (!section.header.empty()) line["section"] = section.header;
+      line["attribute"] = row.attributeNameNonLocalized;
+      line["name"] = cell->nameText();
+      line["value"] = cell->valueText();
+      line["type"] = row.attributeValueType;
+      line["collectedOn"] = wallClockText(row.collectedOn);
+      line["isBookmarked"] = cell->isBookmarked();
+      line["graphable"] = row.graphable;
+      std::cout << jsonLine(line) << '\n';
+    }
+  }
+}
+
+int show(StoreSession& session, const Options& options) {
+  const auto screen = MetricDetailsViewController::make(session.store(), options.tech, options.metric,
+                                                        options.store.subscription, SystemClock().now());
+  screen->viewDidLoad();
+  session.settle();
+  if (screen->metricDetailsViewModel()->metrics().empty()) {
+    complain(fmt::format("there is nothing of {} \"{}\" for subscription {} (see quorl-tool metrics)", options.tech,
+                         options.metric, options.store.subscription));
+    return kFailure;
+  }
+  options.store.asJson ? printJson(screen->view()) : printTable(screen->view());
+  return kSuccess;
+}
+
+}  // namespace
+
+void addShow(CLI::App& tool, Action& chosen) {
+  auto* command = tool.add_subcommand("show", "Print the latest value of each attribute of a metric");
+  command->footer("Names and values are those that the detail screen shows; --json has the stored names beside them.");
+  auto options = std::make_shared<Options>();
+  command->add_option("--tech", options->tech, "Technology, such as LTE")->required();
+  command->add_option("--metric", options->metric, "Metric, such as \"Serving Cell Info\"")->required();
+  addStoreOptions(*command, options->store, /*isTable=*/true);
+  command->callback([&chosen, options] {
+    chosen = [options] {
+      return withStore(options->store, [&](StoreSession& session) { return show(session, *options); });
+    };
+  });
+}
+
+}  // namespace quorl::tool

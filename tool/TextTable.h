@@ -1,0 +1,30 @@
+#pragma once
+
+#include <ostream>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace quorl::tool {
+
+/// Columns of text under a head, each as wide as its widest cell.
+class TextTable {
+ public:
+  explicit TextTable(std::vector<std::string> head) { add(std::move(head)); }
+
+  /// One cell for each column of the head.
+  void add(std::vector<std::string> cells);
+  void print(std::ostream& output) const;
+
+ private:
+  std::vector<std::vector<std::string>> rows_;
+  std::vector<std::size_t> widths_;
+};
+
+/// How many columns of a terminal a UTF-8 text takes, a column for each character.
+std::size_t displayWidth(std::string_view text);
+
+/// `text` with a dot for each control character: stored texts come from outside, and a terminal obeys them.
+std::string printable(std::string text);
+
+}  // namespace quorl::tool
