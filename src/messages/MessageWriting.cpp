@@ -1,10 +1,9 @@
-#include "messages/MetricCodable.h"
-
 #include <bit>
 
 #include <fmt/format.h>
 
 #include "messages/MessageFields.h"
+#include "messages/MetricCodable.h"
 #include "messages/wire/WireWriter.h"
 
 namespace quorl {

@@ -15,9 +15,9 @@
 #include "intake/MetricService.h"
 #include "intake/Payload.h"
 #include "messages/MetricDictionary.h"
-#include "support/RowsOnlyStore.h"
 #include "support/FakePlatform.h"
 #include "support/LogRecorder.h"
+#include "support/RowsOnlyStore.h"
 
 namespace quorl::test {
 
