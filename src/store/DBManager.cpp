@@ -10,11 +10,12 @@
 #include "base/Log.h"
 #include "base/Uuid.h"
 #include "shell/LogCategories.h"
-#include "store/DBManagerWork.h"
 #include "store/MetricStatements.h"
+#include "store/WorkItems.h"
 
 namespace quorl {
 
+using store_detail::enqueueWrite;
 using store_detail::failOnMain;
 using store_detail::onMain;
 using store_detail::succeedOnMain;
@@ -85,8 +86,8 @@ std::string SQLiteDatabase::libraryMessage() const {
 }
 
 void SQLiteDatabase::createTable(std::string sql, std::string tableName, WriteCompletion completion) {
-  enqueueWrite([sql = std::move(sql), tableName = std::move(tableName),
-                completion = std::move(completion)](SQLiteDatabase& self) {
+  enqueueWrite(*this, [sql = std::move(sql), tableName = std::move(tableName),
+                       completion = std::move(completion)](SQLiteDatabase& self) {
     StatementHandle statement;
     if (auto prepared = self.prepareStatement(sql.c_str())) {
       statement = std::move(*prepared);
@@ -136,7 +137,7 @@ std::optional<SQLiteError> SQLiteDatabase::insert(const Metric& metric) {
 }
 
 void SQLiteDatabase::insertMetric(Metric metric, WriteCompletion completion) {
-  enqueueWrite([metric = std::move(metric), completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueWrite(*this, [metric = std::move(metric), completion = std::move(completion)](SQLiteDatabase& self) mutable {
     if (auto error = self.insert(metric)) return failOnMain(std::move(completion), *std::move(error));
     onMain([completion = std::move(completion)] {
       completion(true, std::nullopt);
@@ -146,7 +147,7 @@ void SQLiteDatabase::insertMetric(Metric metric, WriteCompletion completion) {
 }
 
 void SQLiteDatabase::deleteOlderRows(SuccessCompletion completion) {
-  enqueueWrite([completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueWrite(*this, [completion = std::move(completion)](SQLiteDatabase& self) mutable {
     bool success = false;
     if (const auto statement = self.prepareStatement(kDeleteOlderRowsStatement)) {
       success = sqlite3_step(statement->get()) == SQLITE_DONE;
@@ -170,15 +171,15 @@ void SQLiteDatabase::runDashboardStatement(const std::string& sql, WriteCompleti
 }
 
 void SQLiteDatabase::executeDashboardStatement(std::string sql, WriteCompletion completion) {
-  enqueueWrite([sql = std::move(sql), completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueWrite(*this, [sql = std::move(sql), completion = std::move(completion)](SQLiteDatabase& self) mutable {
     self.runDashboardStatement(sql, std::move(completion));
   });
 }
 
 void SQLiteDatabase::removeDashboardItem(std::string_view metricTech, std::string_view attributeName,
                                          std::int32_t subsId, WriteCompletion completion) {
-  enqueueWrite([metricTech = std::string(metricTech), attributeName = std::string(attributeName), subsId,
-                completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueWrite(*this, [metricTech = std::string(metricTech), attributeName = std::string(attributeName), subsId,
+                       completion = std::move(completion)](SQLiteDatabase& self) mutable {
     self.runDashboardStatement(SQLTable<Metric>::removeDashboardItem(metricTech, attributeName, subsId),
                                [completion = std::move(completion)](bool success, std::optional<SQLiteError> error) {
                                  if (success) databaseLog.log("Successfully deleted from dashboard table");
