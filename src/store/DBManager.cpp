@@ -6,13 +6,23 @@
 #include <sqlite3.h>
 #include <sys/stat.h>
 
-#include "base/FatalStop.h"
+#include "base/DateText.h"
+#include "base/Log.h"
 #include "base/Uuid.h"
-#include "platform/Platform.h"
+#include "shell/LogCategories.h"
+#include "store/MetricStatements.h"
+#include "store/WorkItems.h"
 
 namespace quorl {
 
+using store_detail::enqueueWrite;
+using store_detail::failOnMain;
+using store_detail::onMain;
+using store_detail::succeedOnMain;
+
 namespace {
+
+constexpr Logger databaseLog{log_category::kDatabase};
 
 constexpr char kFileName[] = "metricPartV11.sqlite";
 
@@ -73,6 +83,109 @@ std::string SQLiteDatabase::libraryMessage() const {
   const char* text = sqlite3_errmsg(dbPointer_);
   if (text == nullptr) fatalStop("sqlite3_errmsg is nil");
   return text;
+}
+
+void SQLiteDatabase::createTable(std::string sql, std::string tableName, WriteCompletion completion) {
+  enqueueWrite(*this, [sql = std::move(sql), tableName = std::move(tableName),
+                       completion = std::move(completion)](SQLiteDatabase& self) {
+    StatementHandle statement;
+    if (auto prepared = self.prepareStatement(sql.c_str())) {
+      statement = std::move(*prepared);
+    } else {
+      databaseLog.error("%{public}s error ocurred while creating a table", prepared.error());
+      completion(false, prepared.error());
+      return;
+    }
+    if (sqlite3_step(statement.get()) == SQLITE_DONE) {
+      statement.reset();
+      databaseLog.error("%{public}s table created.", tableName);
+      completion(true, std::nullopt);
+      return;
+    }
+    const SQLiteError error{SQLiteError::Case::Prepare, self.libraryMessage()};
+    statement.reset();
+    databaseLog.error("%{public}s error ocurred while creating a table (sqlite3_step)", error);
+    completion(false, error);
+  });
+}
+
+std::optional<SQLiteError> SQLiteDatabase::bind(sqlite3_stmt* statement, const Metric& metric,
+                                                const std::string& collectedOn) {
+  // Nothing is copied: the work item holds the values until the step.
+  const auto bindText = [statement](int index, const std::string& value) {
+    return sqlite3_bind_text(statement, index, value.c_str(), -1, SQLITE_STATIC) == SQLITE_OK;
+  };
+  const auto bindInteger = [statement](int index, std::int32_t value) {
+    return sqlite3_bind_int(statement, index, value) == SQLITE_OK;
+  };
+  if (!bindText(1, metric.metricTech)) return SQLiteError{SQLiteError::Case::Prepare, libraryMessage()};
+  const bool isBound = bindText(2, metric.metricName) && bindText(3, metric.attributeName) &&
+                       bindText(4, metric.attributeValue) && bindText(5, metric.attributeValueType) &&
+                       bindInteger(6, metric.graphable ? 1 : 0) && bindText(7, metric.metricId) &&
+                       bindInteger(8, metric.subsId) && bindText(9, collectedOn);
+  if (!isBound) return SQLiteError{SQLiteError::Case::Bind, libraryMessage()};
+  return std::nullopt;
+}
+
+std::optional<SQLiteError> SQLiteDatabase::insert(const Metric& metric) {
+  const std::string collectedOn = wallClockText(metric.collectedOn);
+  const auto statement = prepareStatement(SQLTable<Metric>::insertMetric);
+  if (!statement) return statement.error();
+  if (auto error = bind(statement->get(), metric, collectedOn)) return error;
+  if (sqlite3_step(statement->get()) != SQLITE_DONE) return SQLiteError{SQLiteError::Case::Prepare, libraryMessage()};
+  return std::nullopt;
+}
+
+void SQLiteDatabase::insertMetric(Metric metric, WriteCompletion completion) {
+  enqueueWrite(*this, [metric = std::move(metric), completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    if (auto error = self.insert(metric)) return failOnMain(std::move(completion), *std::move(error));
+    onMain([completion = std::move(completion)] {
+      completion(true, std::nullopt);
+      databaseLog.log("successfully inserted metric to db");
+    });
+  });
+}
+
+void SQLiteDatabase::deleteOlderRows(SuccessCompletion completion) {
+  enqueueWrite(*this, [completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    bool success = false;
+    if (const auto statement = self.prepareStatement(kDeleteOlderRowsStatement)) {
+      success = sqlite3_step(statement->get()) == SQLITE_DONE;
+      // The wording about a table is meant.
+      if (!success)
+        databaseLog.error("%{public}s error ocurred while creating a table (sqlite3_step)", self.libraryMessage());
+    } else {
+      databaseLog.error("%{public}s error ocurred while deleting old rows (sqlite3_step)", statement.error());
+    }
+    onMain([completion = std::move(completion), success] { completion(success); });
+  });
+}
+
+void SQLiteDatabase::runDashboardStatement(const std::string& sql, WriteCompletion completion) {
+  auto statement = prepareStatement(sql.c_str());
+  if (!statement) return failOnMain(std::move(completion), statement.error());
+  if (sqlite3_step(statement->get()) == SQLITE_DONE) return succeedOnMain(std::move(completion), true);
+  const SQLiteError error{SQLiteError::Case::Prepare, libraryMessage()};
+  statement->reset();
+  completion(false, error);
+}
+
+void SQLiteDatabase::executeDashboardStatement(std::string sql, WriteCompletion completion) {
+  enqueueWrite(*this, [sql = std::move(sql), completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    self.runDashboardStatement(sql, std::move(completion));
+  });
+}
+
+void SQLiteDatabase::removeDashboardItem(std::string_view metricTech, std::string_view attributeName,
+                                         std::int32_t subsId, WriteCompletion completion) {
+  enqueueWrite(*this, [metricTech = std::string(metricTech), attributeName = std::string(attributeName), subsId,
+                       completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    self.runDashboardStatement(SQLTable<Metric>::removeDashboardItem(metricTech, attributeName, subsId),
+                               [completion = std::move(completion)](bool success, std::optional<SQLiteError> error) {
+                                 if (success) databaseLog.log("Successfully deleted from dashboard table");
+                                 completion(success, std::move(error));
+                               });
+  });
 }
 
 }  // namespace quorl

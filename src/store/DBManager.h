@@ -96,11 +96,6 @@ class SQLiteDatabase : public std::enable_shared_from_this<SQLiteDatabase> {
  private:
   explicit SQLiteDatabase(sqlite3* dbPointer);
 
-  template <typename Work>
-  void enqueueWrite(Work work);
-  template <typename Work>
-  void enqueueRead(Work work);
-
   /// The library's text for the last failure. None is a fatal stop.
   std::string libraryMessage() const;
   std::optional<SQLiteError> insert(const Metric& metric);

@@ -11,12 +11,13 @@
 #include "app/HardwareManager.h"
 #include "base/DateText.h"
 #include "store/DBManager.h"
-#include "store/DBManagerWork.h"
 #include "store/EnumeratorPrefix.h"
 #include "store/MetricStatements.h"
+#include "store/WorkItems.h"
 
 namespace quorl {
 
+using store_detail::enqueueRead;
 using store_detail::failOnMain;
 using store_detail::succeedOnMain;
 
@@ -71,7 +72,7 @@ class LocalizedNames {
 }  // namespace
 
 void SQLiteDatabase::fetchAvailableMetrics(std::int32_t subsId, AvailableMetricsCompletion completion) {
-  enqueueRead([subsId, completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueRead(*this, [subsId, completion = std::move(completion)](SQLiteDatabase& self) mutable {
     auto statement = self.prepareStatement(SQLTable<Metric>::availableMetrics(subsId).c_str());
     if (!statement) return failOnMain(std::move(completion), described(statement.error()));
     AvailableMetrics metrics;
@@ -99,9 +100,9 @@ void SQLiteDatabase::fetchAvailableMetrics(std::int32_t subsId, AvailableMetrics
 void SQLiteDatabase::fetchMetricContents(std::string_view metricTech, std::string_view metricName,
                                          std::optional<std::string_view> attributeName, std::int32_t subsId,
                                          MetricsCompletion completion) {
-  enqueueRead([metricTech = std::string(metricTech), metricName = std::string(metricName),
-               attributeName = attributeName ? std::optional<std::string>(*attributeName) : std::nullopt, subsId,
-               completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueRead(*this, [metricTech = std::string(metricTech), metricName = std::string(metricName),
+                      attributeName = attributeName ? std::optional<std::string>(*attributeName) : std::nullopt, subsId,
+                      completion = std::move(completion)](SQLiteDatabase& self) mutable {
     auto statement =
         self.prepareStatement(SQLTable<Metric>::metricContents(metricTech, metricName, attributeName, subsId).c_str());
     if (!statement) return failOnMain(std::move(completion), statement.error());
@@ -142,8 +143,8 @@ void SQLiteDatabase::fetchMetricContents(std::string_view metricTech, std::strin
 
 void SQLiteDatabase::fetchAttributeHistory(std::string_view metricName, std::string_view attributeName,
                                            AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) {
-  enqueueRead([metricName = std::string(metricName), attributeName = std::string(attributeName), timeFrame,
-               completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueRead(*this, [metricName = std::string(metricName), attributeName = std::string(attributeName), timeFrame,
+                      completion = std::move(completion)](SQLiteDatabase& self) mutable {
     // The subscription is the one that is current now, not at the call.
     const std::int32_t currentSubsId = HardwareManager::shared().currentSubsId();
     auto statement = self.prepareStatement(
@@ -179,7 +180,7 @@ void SQLiteDatabase::fetchAttributeHistory(std::string_view metricName, std::str
 }
 
 void SQLiteDatabase::fetchDashboard(std::int32_t subsId, DashboardCompletion completion) {
-  enqueueRead([subsId, completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueRead(*this, [subsId, completion = std::move(completion)](SQLiteDatabase& self) mutable {
     auto statement = self.prepareStatement(SQLTable<Metric>::dashboard(subsId).c_str());
     if (!statement) return failOnMain(std::move(completion), described(statement.error()));
     std::vector<DashboardTableItem> items;
@@ -203,7 +204,7 @@ void SQLiteDatabase::fetchDashboard(std::int32_t subsId, DashboardCompletion com
 }
 
 void SQLiteDatabase::exportMetrics(AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) {
-  enqueueRead([timeFrame, completion = std::move(completion)](SQLiteDatabase& self) mutable {
+  enqueueRead(*this, [timeFrame, completion = std::move(completion)](SQLiteDatabase& self) mutable {
     auto prepared = self.prepareStatement(exportStatement(timeFrame));
     if (!prepared) return failOnMain(std::move(completion), described(prepared.error()));
     // Left unfinalised on purpose, until the connection is closed.

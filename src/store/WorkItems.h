@@ -2,32 +2,33 @@
 
 // How the database's operations run; shared by its writes and its reads.
 
+#include <memory>
 #include <optional>
 #include <utility>
 
 #include "base/FatalStop.h"
 #include "platform/Platform.h"
-#include "store/DBManager.h"
+#include "store/SQLiteError.h"
 
-namespace quorl {
+namespace quorl::store_detail {
 
-template <typename Work>
-void SQLiteDatabase::enqueueWrite(Work work) {
-  queue_->async([weak = weak_from_this(), work = std::move(work)]() mutable {
+/// Queues `work`, which is called with the database. With the database gone it is not called.
+template <typename Database, typename Work>
+void enqueueWrite(Database& database, Work work) {
+  database.queue().async([weak = database.weak_from_this(), work = std::move(work)]() mutable {
     if (const auto self = weak.lock()) work(*self);
   });
 }
 
-template <typename Work>
-void SQLiteDatabase::enqueueRead(Work work) {
-  queue_->async([weak = weak_from_this(), work = std::move(work)]() mutable {
+/// As `enqueueWrite`, but a database that is gone ends the process.
+template <typename Database, typename Work>
+void enqueueRead(Database& database, Work work) {
+  database.queue().async([weak = database.weak_from_this(), work = std::move(work)]() mutable {
     const auto self = weak.lock();
     if (!self) fatalStop("self is nil");
     work(*self);
   });
 }
-
-namespace store_detail {
 
 inline void onMain(Queue::Task task) {
   Platform::current().mainQueue.async(std::move(task));
@@ -47,5 +48,4 @@ void succeedOnMain(Completion completion, Result result) {
   });
 }
 
-}  // namespace store_detail
-}  // namespace quorl
+}  // namespace quorl::store_detail
