@@ -19,7 +19,7 @@ namespace {
 
 struct Options {
   StoreOptions store;
-  AttributeDetailTimeFrame timeFrame = AttributeDetailTimeFrame::daily;
+  std::string timeFrame;
   std::string output;  // empty: standard output
 };
 
@@ -47,7 +47,7 @@ int writeFile(const std::string& path, std::string_view text) {
 int exportRows(StoreSession& session, const Options& options) {
   const auto screen = ExportViewController::make(session.store());
   for (ExportView& row : screen->containerView())
-    if (row.timeFrame() == options.timeFrame) row.didTapExportButton();
+    if (row.timeFrame() == timeFrameNamed(options.timeFrame)) row.didTapExportButton();
   session.settle();
   const std::optional<std::string>& text = session.phone().share().text();
   if (!text) {

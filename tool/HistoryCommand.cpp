@@ -23,7 +23,7 @@ struct Options {
   StoreOptions store;
   std::string metric;
   std::string attribute;
-  AttributeDetailTimeFrame timeFrame = AttributeDetailTimeFrame::daily;
+  std::string timeFrame;
   bool isCharted = false;
 };
 
@@ -79,7 +79,7 @@ int showHistory(StoreSession& session, const Options& options) {
   screen->viewDidLoad();
   session.settle();
   const AttributeDetailsView& view = *screen->view();
-  view.model().selectSegment(static_cast<int>(options.timeFrame));
+  view.model().selectSegment(static_cast<int>(timeFrameNamed(options.timeFrame)));
   if (options.store.asJson) {
     printJson(view);
     return kSuccess;

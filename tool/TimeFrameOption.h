@@ -1,18 +1,25 @@
 #pragma once
 
+#include <string>
+#include <string_view>
+
 #include <CLI/CLI.hpp>
 
 #include "store/Metric.h"
 
 namespace quorl::tool {
 
-/// Adds the required option "--time-frame".
-inline void addTimeFrameOption(CLI::App& command, AttributeDetailTimeFrame& timeFrame) {
-  using Frame = AttributeDetailTimeFrame;
-  command.add_option("--time-frame", timeFrame, "daily, weekly or monthly")
+/// Adds the required option "--time-frame", which takes daily, weekly or monthly.
+inline void addTimeFrameOption(CLI::App& command, std::string& name) {
+  command.add_option("--time-frame", name, "daily, weekly or monthly")
       ->required()
-      ->transform(CLI::Transformer(std::map<std::string, Frame>{
-          {"daily", Frame::daily}, {"weekly", Frame::weekly}, {"monthly", Frame::monthly}}));
+      ->check(CLI::IsMember({"daily", "weekly", "monthly"}));
+}
+
+/// The time frame of a name that the option has let pass.
+inline AttributeDetailTimeFrame timeFrameNamed(std::string_view name) {
+  if (name == "daily") return AttributeDetailTimeFrame::daily;
+  return name == "weekly" ? AttributeDetailTimeFrame::weekly : AttributeDetailTimeFrame::monthly;
 }
 
 }  // namespace quorl::tool

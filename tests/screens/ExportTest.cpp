@@ -101,7 +101,7 @@ class ExportTest : public test::ScreenTest {
   void taps(const std::string& label) { row(label).didTapExportButton(); }
   Metric power(const std::string& value, std::chrono::hours ago = 0h, std::int32_t subsId = 0) {
     Metric metric = reading("LTE", "Tx Power", "power", value, subsId);
-    metric.collectedOn = now() - ago;
+    metric.collectedOn = now() + 1min - ago;  // so that midnight may pass during the test
     return metric;
   }
   std::string shared() {

@@ -28,7 +28,7 @@ class HistoryTest : public test::ScreenTest {
 
   Metric cellId(const std::string& value, std::chrono::hours ago = 0h, std::int32_t subsId = 0) {
     Metric metric = reading("RAT", "Cell Info", "kHVCellMonitorCellId", value, subsId);
-    metric.collectedOn = now() - ago;
+    metric.collectedOn = now() + 1min - ago;  // so that midnight may pass during the test
     return metric;
   }
   void open() {
