@@ -54,13 +54,14 @@ class Phone {
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size < 2) return 0;
-  static std::unique_ptr<Phone> phone;
+  // Never freed at the end: the product's shared objects, which it resets, may be gone by then.
+  static Phone* phone = nullptr;
   static int family = -1;
   // The shared objects are made for one device; another family needs them anew.
   if (family != data[0] % 2) {
     family = data[0] % 2;
-    phone.reset();
-    phone = std::make_unique<Phone>(family == 0 ? "mav" : "ice");
+    delete phone;
+    phone = new Phone(family == 0 ? "mav" : "ice");
   }
   const auto& rows = quorl::MetricGroupV2::metricGroupData();
   phone->deliver(rows[data[1] % rows.size()].zelkorId, {reinterpret_cast<const char*>(data) + 2, size - 2});
