@@ -6,7 +6,10 @@ namespace quorl::simulator {
 
 SimulatedPhone::SimulatedPhone(Options options)
     : loop_(std::make_shared<LoopQueue>("main")),
-      activity_(std::make_shared<Activity>([loop = loop_] { loop->stop(); })),
+      // Weak: a task that waits in the loop for its time holds the activity.
+      activity_(std::make_shared<Activity>([weak = std::weak_ptr(loop_)] {
+        if (const auto loop = weak.lock()) loop->stop();
+      })),
       queues_(activity_),
       mainQueue_(loop_, activity_),
       backgroundQueue_(queues_.makeSerialQueue("background")),
