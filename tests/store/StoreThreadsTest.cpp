@@ -1,3 +1,5 @@
+#include <future>
+
 #include <gtest/gtest.h>
 
 #include "app/HardwareManager.h"
@@ -11,10 +13,23 @@
 namespace quorl {
 namespace {
 
+/// Keeps what it made, so that a test can wait for the threads: one may still be handing its last answer to the main
+/// queue when that answer has long been taken.
 struct ThreadedQueues final : QueueFactory {
   std::shared_ptr<Queue> makeSerialQueue(std::string label) override {
-    return std::make_shared<SerialQueue>(std::move(label));
+    return made.emplace_back(std::make_shared<SerialQueue>(std::move(label)));
   }
+  void join() {
+    // A task may hold the last reference to its own queue; behind this one there is none left.
+    for (const auto& queue : made) {
+      std::promise<void> reached;
+      queue->async([&reached] { reached.set_value(); });
+      reached.get_future().wait();
+    }
+    made.clear();
+  }
+
+  std::vector<std::shared_ptr<Queue>> made;
 };
 
 /// The database on a thread of its own and the main queue on the test's.
@@ -28,6 +43,7 @@ class StoreThreadsTest : public testing::Test {
   }
   ~StoreThreadsTest() override {
     database.reset();
+    queues.join();
     Platform::install(&fake.platform);
   }
 
