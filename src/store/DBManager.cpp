@@ -15,6 +15,7 @@
 
 namespace quorl {
 
+using store_detail::enqueueInsert;
 using store_detail::enqueueWrite;
 using store_detail::failOnMain;
 using store_detail::onMain;
@@ -61,7 +62,8 @@ tl::expected<std::shared_ptr<SQLiteDatabase>, SQLiteError> SQLiteDatabase::open(
 
 SQLiteDatabase::SQLiteDatabase(sqlite3* dbPointer)
     : dbPointer_(dbPointer),
-      queue_(Platform::current().queues.makeSerialQueue("com.ardent.dbmanager.queue -" + Uuid::make().string())) {
+      queue_(Platform::current().queues.makeSerialQueue("com.ardent.dbmanager.queue -" + Uuid::make().string())),
+      handOver_(std::make_shared<store_detail::MainHandOver>(Platform::current().mainQueue)) {
   // A connection that stays out of WAL mode works on.
   sqlite3_exec(dbPointer_, "PRAGMA journal_mode=WAL;", nullptr, nullptr, nullptr);
 }
@@ -137,11 +139,12 @@ std::optional<SQLiteError> SQLiteDatabase::insert(const Metric& metric) {
 }
 
 void SQLiteDatabase::insertMetric(Metric metric, WriteCompletion completion) {
-  enqueueWrite(*this, [metric = std::move(metric), completion = std::move(completion)](SQLiteDatabase& self) mutable {
-    if (auto error = self.insert(metric)) return failOnMain(std::move(completion), *std::move(error));
-    onMain([completion = std::move(completion)] {
-      completion(true, std::nullopt);
-      databaseLog.log("successfully inserted metric to db");
+  enqueueInsert(*this, [metric = std::move(metric), completion = std::move(completion)](
+                           SQLiteDatabase& self, store_detail::MainHandOver& handOver) mutable {
+    std::optional<SQLiteError> error = self.insert(metric);
+    handOver.add([completion = std::move(completion), error = std::move(error)] {
+      completion(!error, error);
+      if (!error) databaseLog.log("successfully inserted metric to db");
     });
   });
 }

@@ -18,6 +18,10 @@ struct sqlite3_stmt;
 
 namespace quorl {
 
+namespace store_detail {
+class MainHandOver;
+}
+
 struct FinalizeStatement {
   void operator()(sqlite3_stmt* statement) const;
 };
@@ -50,6 +54,8 @@ class SQLiteDatabase : public std::enable_shared_from_this<SQLiteDatabase> {
   /// For use on `queue` alone.
   sqlite3* dbPointer() const { return dbPointer_; }
   Queue& queue() const { return *queue_; }
+  /// How completions of inserts reach the main queue; for the work items.
+  const std::shared_ptr<store_detail::MainHandOver>& handOver() const { return handOver_; }
 
   /// On `queue` alone. `Prepare` if `sql` does not prepare. The database must outlive the statement.
   tl::expected<StatementHandle, SQLiteError> prepareStatement(const char* sql);
@@ -104,6 +110,7 @@ class SQLiteDatabase : public std::enable_shared_from_this<SQLiteDatabase> {
 
   sqlite3* const dbPointer_;
   const std::shared_ptr<Queue> queue_;
+  const std::shared_ptr<store_detail::MainHandOver> handOver_;
 };
 
 }  // namespace quorl
