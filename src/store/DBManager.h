@@ -97,7 +97,7 @@ class SQLiteDatabase : public std::enable_shared_from_this<SQLiteDatabase> {
   void fetchDashboard(std::int32_t subsId, DashboardCompletion completion);
   /// All rows of a time frame, of both subscriptions, values as stored and without value types. `EmptyQueryResult`
   /// comes on the database's queue. The statement stays with the connection until that is closed.
-  void exportMetrics(AttributeDetailTimeFrame timeFrame, MetricsCompletion completion);
+  void exportMetrics(AttributeDetailTimeFrame timeFrame, ExportCompletion completion);
 
  private:
   explicit SQLiteDatabase(sqlite3* dbPointer);

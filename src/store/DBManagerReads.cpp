@@ -203,35 +203,32 @@ void SQLiteDatabase::fetchDashboard(std::int32_t subsId, DashboardCompletion com
   });
 }
 
-void SQLiteDatabase::exportMetrics(AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) {
+void SQLiteDatabase::exportMetrics(AttributeDetailTimeFrame timeFrame, ExportCompletion completion) {
   enqueueRead(*this, [timeFrame, completion = std::move(completion)](SQLiteDatabase& self) mutable {
     auto prepared = self.prepareStatement(exportStatement(timeFrame));
     if (!prepared) return failOnMain(std::move(completion), described(prepared.error()));
     // Left unfinalised on purpose, until the connection is closed.
     sqlite3_stmt* const statement = prepared->release();
-    std::vector<Metric> metrics;
+    ExportedMetrics metrics;
+    StringTable& strings = Platform::current().strings;
     WallClockReader dates;
-    LocalizedNames names;
     while (sqlite3_step(statement) == SQLITE_ROW) {
       RowReader row(statement);
-      Metric metric;
-      metric.metricTech = row.text(0);
-      metric.metricName = row.text(1);
-      metric.attributeNameNonLocalized = row.text(2);
-      metric.attributeValue = row.text(3);
+      ExportedMetric metric;
+      metric.metricTech = row.view(0);
+      metric.metricName = row.view(1);
+      metric.attributeNameNonLocalized = row.view(2);
+      metric.attributeValue = row.view(3);
       metric.subsId = row.integer(4);
-      metric.metricId = row.text(5);
-      const std::string_view collectedOn = row.view(6);
-      const std::optional<Date> date = dates.read(collectedOn);
+      metric.metricId = row.view(5);
+      const std::optional<Date> date = dates.read(row.view(6));
       if (row.hasNull() || !date) {
         // Its snapshot must not outlive the read, or the journal could never be taken back.
         sqlite3_reset(statement);
         return completion({}, emptyQueryResult());
       }
-      metric.id = Uuid::make();
-      metric.attributeName = names.of(metric.attributeNameNonLocalized);
       metric.collectedOn = *date;
-      metrics.push_back(std::move(metric));
+      metrics.append(metric, strings);
     }
     succeedOnMain(std::move(completion), std::move(metrics));
   });

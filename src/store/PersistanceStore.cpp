@@ -170,7 +170,7 @@ void PersistanceStore::fetchDashboard(std::int32_t subsId, DashboardCompletion c
   database().fetchDashboard(subsId, std::move(completion));
 }
 
-void PersistanceStore::exportMetrics(AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) {
+void PersistanceStore::exportMetrics(AttributeDetailTimeFrame timeFrame, ExportCompletion completion) {
   database().exportMetrics(timeFrame, std::move(completion));
 }
 

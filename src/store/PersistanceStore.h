@@ -82,7 +82,7 @@ class PersistanceStore final : public PersistanceStoreProtocol {
   void fetchAttributeHistory(std::string_view metricName, std::string_view attributeName,
                              AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) override;
   void fetchDashboard(std::int32_t subsId, DashboardCompletion completion) override;
-  void exportMetrics(AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) override;
+  void exportMetrics(AttributeDetailTimeFrame timeFrame, ExportCompletion completion) override;
 
  private:
   void tablesCreated();

@@ -16,6 +16,7 @@ class PersistanceStoreProtocol {
   using WriteCompletion = quorl::WriteCompletion;
   using AvailableMetricsCompletion = quorl::AvailableMetricsCompletion;
   using MetricsCompletion = quorl::MetricsCompletion;
+  using ExportCompletion = quorl::ExportCompletion;
   using DashboardCompletion = quorl::DashboardCompletion;
 
   virtual ~PersistanceStoreProtocol() = default;
@@ -34,7 +35,7 @@ class PersistanceStoreProtocol {
   /// The pinned attributes of one subscription, one of each name, sorted by it.
   virtual void fetchDashboard(std::int32_t subsId, DashboardCompletion completion) = 0;
   /// All rows of a time frame, of all subscriptions.
-  virtual void exportMetrics(AttributeDetailTimeFrame timeFrame, MetricsCompletion completion) = 0;
+  virtual void exportMetrics(AttributeDetailTimeFrame timeFrame, ExportCompletion completion) = 0;
 };
 
 }  // namespace quorl

@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "store/ExportedMetrics.h"
 #include "store/Metric.h"
 #include "store/SQLiteError.h"
 
@@ -21,6 +22,7 @@ using SuccessCompletion = std::function<void(bool success)>;
 using WriteCompletion = std::function<void(bool success, std::optional<SQLiteError> error)>;
 using AvailableMetricsCompletion = std::function<void(AvailableMetrics metrics, std::optional<SQLiteError> error)>;
 using MetricsCompletion = std::function<void(std::vector<Metric> metrics, std::optional<SQLiteError> error)>;
+using ExportCompletion = std::function<void(ExportedMetrics metrics, std::optional<SQLiteError> error)>;
 using DashboardCompletion =
     std::function<void(std::vector<DashboardTableItem> items, std::optional<SQLiteError> error)>;
 

@@ -25,8 +25,31 @@ Metric exampleRow() {
   return metric;
 }
 
+std::string textOf(const Metric& metric) {
+  std::string text;
+  appendMetricText(text, metric);
+  return text;
+}
+
+ExportedMetrics exportOf(const std::vector<Metric>& metrics) {
+  test::FakeStrings strings;
+  ExportedMetrics rows;
+  for (const Metric& metric : metrics)
+    rows.append({{},
+                 metric.metricTech,
+                 metric.metricName,
+                 {},
+                 metric.attributeNameNonLocalized,
+                 metric.attributeValue,
+                 metric.collectedOn,
+                 metric.metricId,
+                 metric.subsId},
+                strings);
+  return rows;
+}
+
 TEST(ExportTextTest, ARowIsPrintedWithAllThirteenFields) {
-  EXPECT_EQ(exportText({exampleRow()}),
+  EXPECT_EQ(textOf(exampleRow()),
             "QuorlInternal_4.Metric(id: 6D9C1C4A-0000-4000-8000-000000000000, metricTech: LTE, metricName: Serving "
             "Cell Info, attributeName: dl_freq, attributeNameNonLocalized: dl_freq, attributeValue: 5230, "
             "attributeValueType: , collectedOn: 2026-01-05 09:30:12 +0000, metricId: 803010, subsId: 0, graphable: "
@@ -34,9 +57,9 @@ TEST(ExportTextTest, ARowIsPrintedWithAllThirteenFields) {
 }
 
 TEST(ExportTextTest, RowsAreJoinedByASingleComma) {
-  std::string one;
-  appendMetricText(one, exampleRow());
-  EXPECT_EQ(exportText({exampleRow(), exampleRow(), exampleRow()}), one + "," + one + "," + one);
+  const ExportedMetrics rows = exportOf({exampleRow(), exampleRow(), exampleRow()});
+  EXPECT_EQ(exportText(rows),
+            textOf(rows.row(0).metric()) + "," + textOf(rows.row(1).metric()) + "," + textOf(rows.row(2).metric()));
 }
 
 TEST(ExportTextTest, NoRowsGiveAnEmptyText) {
@@ -46,7 +69,7 @@ TEST(ExportTextTest, NoRowsGiveAnEmptyText) {
 TEST(ExportTextTest, NothingIsQuotedOrEscapedAsMeant) {
   Metric metric = exampleRow();
   metric.attributeValue = "a,b (\"c\")\n";
-  EXPECT_THAT(exportText({metric}), HasSubstr("attributeValue: a,b (\"c\")\n, attributeValueType"));
+  EXPECT_THAT(textOf(metric), HasSubstr("attributeValue: a,b (\"c\")\n, attributeValueType"));
 }
 
 TEST(ExportTextTest, FlagsSubscriptionAndSectionPrintAsTheyAre) {
@@ -55,22 +78,22 @@ TEST(ExportTextTest, FlagsSubscriptionAndSectionPrintAsTheyAre) {
   metric.graphable = true;
   metric.isBookmarked = true;
   metric.sectionNumber = "2";
-  EXPECT_THAT(exportText({metric}),
+  EXPECT_THAT(textOf(metric),
               ::testing::EndsWith("subsId: -2147483648, graphable: true, isBookmarked: true, sectionNumber: "
                                   "Optional(\"2\"))"));
 }
 
 TEST(ExportTextTest, TimesOfManyDaysInAnyOrderPrintLikeOneByOne) {
   const test::ScopedTimeZone zone("America/New_York");
-  std::vector<Metric> rows;
-  std::string expected;
+  std::vector<Metric> metrics;
   for (const std::int64_t seconds :
        {1767605412, 1767571200, 1767571199, 0, -1, -86400, -86401, 1772953200, 1772953199, 951827696}) {
-    rows.push_back(exampleRow());
-    rows.back().collectedOn = Date(std::chrono::seconds(seconds));
-    if (!expected.empty()) expected += ",";
-    appendMetricText(expected, rows.back());
+    metrics.push_back(exampleRow());
+    metrics.back().collectedOn = Date(std::chrono::seconds(seconds));
   }
+  const ExportedMetrics rows = exportOf(metrics);
+  std::string expected;
+  for (std::size_t i = 0; i < rows.size(); ++i) expected += (i > 0 ? "," : "") + textOf(rows.row(i).metric());
   EXPECT_EQ(exportText(rows), expected);
   EXPECT_THAT(expected, HasSubstr("collectedOn: 1969-12-31 23:59:59 +0000"));
   EXPECT_THAT(expected, HasSubstr("collectedOn: 1969-12-31 00:00:00 +0000"));
@@ -81,7 +104,7 @@ TEST(ExportTextTest, TimesOfManyDaysInAnyOrderPrintLikeOneByOne) {
 TEST(ExportTextTest, ATimeIsCutOffToItsSecond) {
   Metric metric = exampleRow();
   metric.collectedOn += 999'999us;
-  EXPECT_EQ(exportText({metric}), exportText({exampleRow()}));
+  EXPECT_EQ(textOf(metric), textOf(exampleRow()));
 }
 
 /// What a statement counts as now is the machine's time.

@@ -175,9 +175,14 @@ class DatabaseFixture : public testing::Test {
     return outcome;
   }
   Read exported(AttributeDetailTimeFrame timeFrame) {
-    Read outcome;
-    database->exportMetrics(timeFrame, into(outcome));
+    Outcome<ExportedMetrics> rows;
+    database->exportMetrics(timeFrame, into(rows));
     platform.time.settle();
+    Read outcome;
+    outcome.calls = rows.calls;
+    outcome.error = std::move(rows.error);
+    outcome.place = rows.place;
+    for (std::size_t i = 0; i < rows.result.size(); ++i) outcome.result.push_back(rows.result.row(i).metric());
     return outcome;
   }
 

@@ -84,7 +84,7 @@ TEST_F(StoreThreadsTest, InsertsAndReadsFromTheMainLoopKeepTheirOrder) {
       });
       if (i % 10 != 9) continue;
       database->exportMetrics(AttributeDetailTimeFrame::monthly,
-                              [&, i](const std::vector<Metric>& rows, const std::optional<SQLiteError>& error) {
+                              [&, i](const ExportedMetrics& rows, const std::optional<SQLiteError>& error) {
                                 EXPECT_EQ(error, std::nullopt);
                                 if (rows.size() != static_cast<std::size_t>(i) + 1 || written != i + 1)
                                   sawEveryEarlierRow = false;

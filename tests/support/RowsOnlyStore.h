@@ -20,7 +20,7 @@ class RowsOnlyStore : public PersistanceStoreProtocol {
   void fetchDashboard(std::int32_t /*subsId*/, DashboardCompletion /*completion*/) final {
     ADD_FAILURE() << "fetchDashboard";
   }
-  void exportMetrics(AttributeDetailTimeFrame /*timeFrame*/, MetricsCompletion /*completion*/) final {
+  void exportMetrics(AttributeDetailTimeFrame /*timeFrame*/, ExportCompletion /*completion*/) final {
     ADD_FAILURE() << "exportMetrics";
   }
 };

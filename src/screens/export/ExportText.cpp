@@ -4,6 +4,7 @@
 #include <charconv>
 #include <chrono>
 #include <cstdint>
+#include <optional>
 #include <string_view>
 
 #include "base/DateText.h"
@@ -69,7 +70,15 @@ std::string_view boolText(bool value) {
   return value ? "true" : "false";
 }
 
-void append(std::string& text, const Metric& metric, UtcTextWriter& times) {
+/// What a record of an export has of the fields that only other records use, too.
+struct Extras {
+  std::string_view attributeValueType;
+  bool graphable = false;
+  bool isBookmarked = false;
+  const std::optional<std::string>* sectionNumber = nullptr;
+};
+
+void append(std::string& text, const ExportedMetric& metric, const Extras& extras, UtcTextWriter& times) {
   text.append("QuorlInternal_4.Metric(id: ");
   appendUuid(text, metric.id);
   text.append(", metricTech: ").append(metric.metricTech);
@@ -77,43 +86,45 @@ void append(std::string& text, const Metric& metric, UtcTextWriter& times) {
   text.append(", attributeName: ").append(metric.attributeName);
   text.append(", attributeNameNonLocalized: ").append(metric.attributeNameNonLocalized);
   text.append(", attributeValue: ").append(metric.attributeValue);
-  text.append(", attributeValueType: ").append(metric.attributeValueType);
+  text.append(", attributeValueType: ").append(extras.attributeValueType);
   text.append(", collectedOn: ");
   times.append(text, metric.collectedOn);
   text.append(", metricId: ").append(metric.metricId);
   text.append(", subsId: ");
   appendInteger(text, metric.subsId);
-  text.append(", graphable: ").append(boolText(metric.graphable));
-  text.append(", isBookmarked: ").append(boolText(metric.isBookmarked));
-  if (metric.sectionNumber) {
-    text.append(", sectionNumber: Optional(\"").append(*metric.sectionNumber).append("\"))");
+  text.append(", graphable: ").append(boolText(extras.graphable));
+  text.append(", isBookmarked: ").append(boolText(extras.isBookmarked));
+  if (extras.sectionNumber != nullptr && *extras.sectionNumber) {
+    text.append(", sectionNumber: Optional(\"").append(**extras.sectionNumber).append("\"))");
   } else {
     text.append(", sectionNumber: nil)");
   }
 }
 
-std::size_t sizeOfTexts(const Metric& metric) {
+std::size_t sizeOfTexts(const ExportedMetric& metric) {
   return metric.metricTech.size() + metric.metricName.size() + metric.attributeName.size() +
-         metric.attributeNameNonLocalized.size() + metric.attributeValue.size() + metric.attributeValueType.size() +
-         metric.metricId.size() + (metric.sectionNumber ? metric.sectionNumber->size() : 0);
+         metric.attributeNameNonLocalized.size() + metric.attributeValue.size() + metric.metricId.size();
 }
 
 }  // namespace
 
 void appendMetricText(std::string& text, const Metric& metric) {
   UtcTextWriter times;
-  append(text, metric, times);
+  append(text,
+         {metric.id, metric.metricTech, metric.metricName, metric.attributeName, metric.attributeNameNonLocalized,
+          metric.attributeValue, metric.collectedOn, metric.metricId, metric.subsId},
+         {metric.attributeValueType, metric.graphable, metric.isBookmarked, &metric.sectionNumber}, times);
 }
 
-std::string exportText(const std::vector<Metric>& metrics) {
+std::string exportText(const ExportedMetrics& metrics) {
   std::size_t size = 0;
-  for (const Metric& metric : metrics) size += kFixedSize + sizeOfTexts(metric);
+  for (std::size_t i = 0; i < metrics.size(); ++i) size += kFixedSize + sizeOfTexts(metrics.row(i));
   std::string text;
   text.reserve(size);
   UtcTextWriter times;
-  for (const Metric& metric : metrics) {
-    if (!text.empty()) text.push_back(',');
-    append(text, metric, times);
+  for (std::size_t i = 0; i < metrics.size(); ++i) {
+    if (i > 0) text.push_back(',');
+    append(text, metrics.row(i), {}, times);
   }
   return text;
 }

@@ -1,9 +1,8 @@
 #pragma once
 
 #include <string>
-#include <vector>
 
-#include "store/Metric.h"
+#include "store/ExportedMetrics.h"
 
 namespace quorl {
 
@@ -12,6 +11,6 @@ namespace quorl {
 void appendMetricText(std::string& text, const Metric& metric);
 
 /// The prints of all records, in their order, with a comma between two and nothing else. Any thread.
-std::string exportText(const std::vector<Metric>& metrics);
+std::string exportText(const ExportedMetrics& metrics);
 
 }  // namespace quorl

@@ -2,7 +2,6 @@
 
 #include <optional>
 #include <utility>
-#include <vector>
 
 #include "base/FatalStop.h"
 #include "base/Log.h"
@@ -40,7 +39,7 @@ void ExportView::didTapExportButton() {
   screen->loadingView().setLoadingLabelText("Gathering metrics from database");
   screen->loadingView().show();
   screen->persistanceStore()->exportMetrics(
-      timeFrame_, [delegate = delegate_](std::vector<Metric> metrics, std::optional<SQLiteError> error) {
+      timeFrame_, [delegate = delegate_](const ExportedMetrics& metrics, const std::optional<SQLiteError>& error) {
         if (error) {
           generalLog.log("error  ---> %{public}s)", *error);  // the bracket is part of the line
           return;
