@@ -131,13 +131,17 @@ Date WallClockReader::resolve(std::int64_t secondsAsUtc) {
 }
 
 std::optional<Date> WallClockReader::read(std::string_view text) {
-  if (text.size() != 19 || text[10] != ' ' || text[13] != ':' || text[16] != ':') return std::nullopt;
+  if (text.size() != kTextSize) return std::nullopt;
+  if (text[0] != '\0' && text == std::string_view(lastText_.data(), kTextSize)) return lastDate_;
+  if (text[10] != ' ' || text[13] != ':' || text[16] != ':') return std::nullopt;
   const std::optional<std::int64_t> day = dayAsUtc(text);
   const int hour = digits(text, 11, 2);
   const int minute = digits(text, 14, 2);
   const int second = digits(text, 17, 2);
   if (!day || hour < 0 || hour > 23 || minute < 0 || minute > 59 || second < 0 || second > 59) return std::nullopt;
-  return resolve(*day + hour * 3600 + minute * 60 + second);
+  lastDate_ = resolve(*day + hour * 3600 + minute * 60 + second);
+  text.copy(lastText_.data(), kTextSize);
+  return lastDate_;
 }
 
 std::optional<Date> WallClockReader::readDay(std::string_view text) {

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <array>
+#include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -24,8 +26,12 @@ class WallClockReader {
   std::optional<Date> readDay(std::string_view text);
 
  private:
+  static constexpr std::size_t kTextSize = 19;
+
   Date resolve(std::int64_t secondsAsUtc);
 
+  std::array<char, kTextSize> lastText_{};  // of the last text read, as rows of one message share their time
+  Date lastDate_;
   std::int64_t day_;
   std::int64_t offset_ = 0;
   bool offsetIsSteady_ = false;

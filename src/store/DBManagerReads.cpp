@@ -55,6 +55,18 @@ class RowReader {
   bool hasNull_ = false;
 };
 
+/// Holds the connection's own mutex, which is a recursive one.
+class ConnectionLock {
+ public:
+  explicit ConnectionLock(sqlite3* connection) : mutex_(sqlite3_db_mutex(connection)) { sqlite3_mutex_enter(mutex_); }
+  ~ConnectionLock() { sqlite3_mutex_leave(mutex_); }
+  ConnectionLock(const ConnectionLock&) = delete;
+  ConnectionLock& operator=(const ConnectionLock&) = delete;
+
+ private:
+  sqlite3_mutex* const mutex_;
+};
+
 /// Localised attribute names of one read: few names, many rows.
 class LocalizedNames {
  public:
@@ -212,6 +224,8 @@ void SQLiteDatabase::exportMetrics(AttributeDetailTimeFrame timeFrame, ExportCom
     ExportedMetrics metrics;
     StringTable& strings = Platform::current().strings;
     WallClockReader dates;
+    // Entered once for all rows: each column would do so again, and nobody else uses the connection.
+    const ConnectionLock lock(self.dbPointer());
     while (sqlite3_step(statement) == SQLITE_ROW) {
       RowReader row(statement);
       ExportedMetric metric;

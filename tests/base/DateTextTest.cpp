@@ -125,6 +125,18 @@ TEST(DateTextTest, AnImpossibleDateAnswersNothing) {
   EXPECT_TRUE(parseWallClock("2000-02-29 23:59:59"));
 }
 
+TEST(DateTextTest, AReaderReadsTheSameTextTwiceAndIsNotMisledByOneThatFails) {
+  const ScopedTimeZone zone("UTC");
+  WallClockReader reader;
+  EXPECT_EQ(reader.read(std::string(19, '\0')), std::nullopt);
+  for (int i = 0; i < 2; ++i) EXPECT_EQ(reader.read("2026-01-05 09:30:12"), utc(2026, 1, 5, 9, 30, 12));
+  EXPECT_EQ(reader.read("2026-01-05 09:30:60"), std::nullopt);
+  EXPECT_EQ(reader.read("2026-01-05 09:30:60"), std::nullopt);
+  EXPECT_EQ(reader.read("2026-01-05 09:30:12"), utc(2026, 1, 5, 9, 30, 12));
+  EXPECT_EQ(reader.readDay("2026-01-06"), utc(2026, 1, 6, 0, 0, 0));
+  EXPECT_EQ(reader.read("2026-01-05 09:30:12"), utc(2026, 1, 5, 9, 30, 12));
+}
+
 TEST(DateTextTest, UtcTextIsTheSameInEveryZone) {
   for (const char* name : {"UTC", "Asia/Tokyo", "America/New_York"}) {
     const ScopedTimeZone zone(name);
