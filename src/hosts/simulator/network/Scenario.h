@@ -1,0 +1,175 @@
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <filesystem>
+#include <istream>
+#include <string>
+#include <string_view>
+#include <variant>
+#include <vector>
+
+#include "hosts/simulator/network/Cell.h"
+#include "hosts/simulator/network/ModemState.h"
+
+// A scenario: a small radio network, a way through it, the SIMs, and what its user does. docs/scenarios.md tells the
+// text form.
+
+namespace quorl::simulator::network {
+
+/// Models of TR 38.901, table 7.4.1-1.
+enum class Environment : std::uint8_t { UrbanMacro, StreetCanyon, RuralMacro };
+
+struct Operator {
+  std::string id;  // as the scenario's other lines name it
+  Plmn plmn;
+  std::string carrier;  // its name as shown
+};
+
+/// A carrier of an operator, as its sites may send it.
+struct Layer {
+  std::string id;
+  std::uint8_t operatorIndex = 0;
+  Technology technology = Technology::Lte;
+  std::uint16_t band = 0;
+  std::uint32_t channel = 0;
+  std::uint16_t bandwidthMhzX10 = 0;
+  Centi power = 4600;  // of the whole carrier, dBm
+  std::uint8_t ports = 2;
+  std::uint8_t beams = 1;
+  std::uint8_t priority = 0;
+  bool isStandAlone = false;
+};
+
+struct Site {
+  std::uint8_t operatorIndex = 0;
+  double x = 0;  // metres, east
+  double y = 0;  // metres, north
+  double height = 25;
+  std::uint32_t areaCode = 0;
+  std::vector<std::uint16_t> azimuths;  // degrees, one sector each; none: one sector without direction
+  std::vector<std::uint16_t> layers;    // indices into Scenario::layers
+};
+
+/// A rectangle that weakens everything outside of it: a building or a tunnel.
+struct Zone {
+  std::string name;
+  double left = 0;
+  double bottom = 0;
+  double right = 0;
+  double top = 0;
+  Centi loss = 0;
+};
+
+struct Waypoint {
+  double x = 0;
+  double y = 0;
+  double metresPerSecond = 0;  // on the way to it
+  std::uint32_t waitMs = 0;    // once there
+};
+enum class RouteEnd : std::uint8_t { Stop, Loop, Return };
+
+struct Sim {
+  bool isPresent = false;
+  std::uint8_t operatorIndex = 0;
+  std::vector<std::uint8_t> roaming;    // operators that take it as a guest
+  std::vector<std::uint8_t> forbidden;  // operators that refuse it
+  double sessionsPerHour = 0;           // data sessions besides the script
+  double sessionSeconds = 10;           // their mean length
+  double callsPerHour = 0;
+  double talkSeconds = 60;
+  bool hasVoiceOverLte = true;  // else a call falls back
+};
+
+struct CdmaStation {
+  double x = 0;
+  double y = 0;
+  double metres = 0;  // as far as it is heard
+  CdmaSystem system;
+};
+
+namespace action {
+struct PlaceCall {
+  std::uint8_t subscription = 0;
+  bool isOutgoing = true;
+  double talkSeconds = 60;
+  bool isAnswered = true;
+};
+struct UseData {
+  std::uint8_t subscription = 0;
+  double seconds = 10;
+};
+struct SetScreen {
+  bool isOn = true;
+};
+struct SetAirplane {
+  bool isOn = true;
+};
+struct SetSim {
+  std::uint8_t subscription = 0;
+  bool isPresent = true;
+};
+struct SetDataSlot {
+  std::uint8_t subscription = 0;
+};
+struct SetLoad {
+  double share = 0.5;  // 0 to 1 of the cells' capacity that others use
+};
+struct StallData {
+  std::uint8_t subscription = 0;
+  double seconds = 20;
+  bool isDnsFailure = false;
+};
+struct MetricTraffic {
+  std::uint8_t kind = 0;  // event::CueKind
+  std::uint32_t count = 1;
+  std::uint32_t bytes = 0;
+};
+using Action =
+    std::variant<PlaceCall, UseData, SetScreen, SetAirplane, SetSim, SetDataSlot, SetLoad, StallData, MetricTraffic>;
+}  // namespace action
+
+struct ScriptStep {
+  SimulatedMs atMs = 0;
+  SimulatedMs everyMs = 0;  // again after this long; 0: once
+  action::Action action;
+};
+
+struct Scenario {
+  std::string name;
+  std::string about;
+  Environment environment = Environment::UrbanMacro;
+  double load = 0.4;  // share of the cells' capacity that others use
+  std::vector<Operator> operators;
+  std::vector<Layer> layers;
+  std::vector<Site> sites;
+  std::vector<Zone> zones;
+  std::vector<CdmaStation> cdmaStations;
+  std::vector<Waypoint> route;  // at least one
+  RouteEnd routeEnd = RouteEnd::Stop;
+  std::array<Sim, 2> sims;
+  std::vector<ScriptStep> steps;  // in the order of the file
+};
+
+/// What is wrong with a line.
+struct ScenarioProblem {
+  std::string file;
+  std::size_t line = 0;  // from 1; 0 for the file as a whole
+  std::string reason;
+};
+
+/// "city.scenario:3: no layer of that name: b33".
+std::string logText(const ScenarioProblem& problem);
+
+struct ScenarioReading {
+  Scenario scenario;                      // to be used only without problems
+  std::vector<ScenarioProblem> problems;  // in the order of the lines, those of the whole file last
+};
+
+/// Reads a scenario; `name` is for the problems. Never throws.
+ScenarioReading readScenario(std::istream& input, std::string_view name);
+/// The same from a file.
+ScenarioReading readScenario(const std::filesystem::path& file);
+
+}  // namespace quorl::simulator::network
