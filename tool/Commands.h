@@ -23,6 +23,7 @@ void addDecode(CLI::App& tool, Action& chosen);
 void addEncode(CLI::App& tool, Action& chosen);
 void addCatalogue(CLI::App& tool, Action& chosen);
 void addReplay(CLI::App& tool, Action& chosen);
+void addCarriers(CLI::App& tool, Action& chosen);
 void addSchema(CLI::App& tool, Action& chosen);
 void addSummary(CLI::App& tool, Action& chosen);
 void addMakeRecording(CLI::App& tool, Action& chosen);

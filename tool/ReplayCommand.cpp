@@ -6,7 +6,6 @@
 #include <filesystem>
 #include <iostream>
 #include <iterator>
-#include <limits>
 #include <memory>
 #include <optional>
 #include <string>
@@ -19,6 +18,7 @@
 #include "Commands.h"
 #include "Documents.h"
 #include "MessageJson.h"
+#include "Player.h"
 #include "TimeShift.h"
 #include "ToolLog.h"
 #include "app/AppDelegate.h"
@@ -26,7 +26,6 @@
 #include "base/NotificationCenter.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/SimulatedPhone.h"
-#include "hosts/simulator/TelephonyScript.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MetricCodable.h"
 #include "shell/NotificationNames.h"
@@ -36,7 +35,6 @@ namespace {
 
 using simulator::RecordedEvent;
 using simulator::SimulatedPhone;
-using simulator::TelephonyScriptStep;
 
 struct Options {
   simulator::DeviceDescription device;
@@ -82,20 +80,6 @@ bool isReadable(const RecordedEvent& event, const MetricGroupV2& row) {
   return message->isReadWhole();
 }
 
-/// The steps of a script, if there is one. Bad lines are told and counted in `faults`.
-std::optional<std::vector<TelephonyScriptStep>> readScript(const std::string& file, std::size_t& faults) {
-  if (file.empty()) return std::vector<TelephonyScriptStep>();
-  simulator::TelephonyScript script = simulator::readTelephonyScript(std::filesystem::path(file));
-  bool isReadable = true;
-  for (simulator::TelephonyScriptProblem& problem : script.problems) {
-    problem.file = file;  // as the user has named it
-    complain(logText(problem));
-    isReadable = isReadable && problem.line > 0;
-  }
-  faults += script.problems.size();
-  return isReadable ? std::optional(std::move(script.steps)) : std::nullopt;
-}
-
 /// Counts what becomes of an event by the catalogue, whatever the device then does with it.
 void countEvent(const RecordedEvent& event, Summary& summary) {
   ++summary.events;
@@ -125,47 +109,6 @@ class RowCounter {
   std::atomic<std::uint64_t> rows_{0};
   NotificationCenter::Observation fromChannel_;
   NotificationCenter::Observation fromTelephony_;
-};
-
-/// Plays recordings and telephony script by their times, as fast as the product takes them.
-class Player {
- public:
-  Player(SimulatedPhone& phone, std::vector<TelephonyScriptStep> steps) : phone_(phone), steps_(std::move(steps)) {}
-
-  /// Does all steps that are due at `time`, one after the other and each to its end.
-  void goTo(std::chrono::milliseconds time) {
-    for (; nextStep_ < steps_.size() && steps_[nextStep_].at <= time; ++nextStep_) {
-      phone_.runUntilAtRest();
-      phone_.telephony().perform(steps_[nextStep_].event);
-      phone_.runUntilAtRest();
-    }
-  }
-
-  /// False if the baseband manager had no client for one of the events.
-  bool play(const std::vector<RecordedEvent>& events) {
-    // A long recording does not pile up in front of the store.
-    constexpr std::size_t kPortion = 256;
-    bool isTaken = true;
-    for (std::size_t at = 0; at < events.size(); ++at) {
-      if (events[at].atMs) goTo(milliseconds(*events[at].atMs));
-      isTaken = phone_.baseband().deliver(zelkor::kEventMetric, events[at].message()) && isTaken;
-      if (at % kPortion == kPortion - 1) phone_.runUntilAtRest();
-    }
-    phone_.runUntilAtRest();
-    goTo(std::chrono::milliseconds::max());
-    return isTaken;
-  }
-
- private:
-  static std::chrono::milliseconds milliseconds(std::uint64_t count) {
-    using Count = std::chrono::milliseconds::rep;
-    return std::chrono::milliseconds(std::in_range<Count>(count) ? static_cast<Count>(count)
-                                                                 : std::numeric_limits<Count>::max());
-  }
-
-  SimulatedPhone& phone_;
-  const std::vector<TelephonyScriptStep> steps_;
-  std::size_t nextStep_ = 0;
 };
 
 void print(const Summary& summary) {

@@ -12,7 +12,6 @@
 namespace quorl {
 namespace {
 
-constexpr std::int64_t kSecondsPerDay = 86400;
 /// All that is not the rows' own texts: field names, separators, id, time, flags and a number.
 constexpr std::size_t kFixedSize = 352;
 
