@@ -1,0 +1,29 @@
+import QtQuick
+import QtQuick.Controls.Basic
+import Quorl
+
+ApplicationWindow {
+    id: window
+
+    required property ShellBinding shell
+
+    objectName: "appWindow"
+    title: "Quorl"
+    width: 390
+    height: 844
+    minimumWidth: 320
+    minimumHeight: 480
+    visible: true
+    color: Theme.background
+    palette {
+        window: Theme.background
+        windowText: Theme.title
+        base: Theme.background
+        text: Theme.title
+        button: Theme.card
+        buttonText: Theme.title
+        highlight: Theme.buttonSelected
+        highlightedText: Theme.background
+        placeholderText: Theme.header
+    }
+}
