@@ -5,68 +5,37 @@
 
 #include <cstdlib>
 #include <filesystem>
-#include <map>
-#include <memory>
 #include <optional>
 #include <string>
-#include <utility>
 #include <vector>
 
 #include <benchmark/benchmark.h>
 #include <fmt/format.h>
 #include <sqlite3.h>
-#include <stdlib.h>
 
+#include "StoreBench.h"
 #include "base/DateText.h"
-#include "base/SerialQueue.h"
 #include "store/DBManager.h"
 #include "store/MetricStatements.h"
-#include "support/FakePlatform.h"
 
 namespace quorl {
 namespace {
 
 constexpr int kRepetitions = 41;
 
-struct ThreadedQueues final : QueueFactory {
-  std::shared_ptr<Queue> makeSerialQueue(std::string label) override {
-    return std::make_shared<SerialQueue>(std::move(label));
-  }
-};
-
-/// A phone whose main queue is the bench's thread.
-struct Phone {
-  Phone() { Platform::install(&platform); }
-
-  test::FakePlatform fake;
-  ThreadedQueues queues;
-  LoopQueue main{"main"};
-  Platform platform{main,           main,           queues,          fake.time,    fake.properties,
-                    fake.resources, fake.documents, fake.strings,    fake.console, fake.alerts,
-                    fake.analytics, fake.share,     fake.pasteboard, fake.zelkor,  fake.silentTelephony};
-};
-
-/// A new database with its tables, in a directory of its own below `directory`.
+/// A new database with its table of metrics.
 class Site {
  public:
-  explicit Site(const std::filesystem::path& directory) {
-    std::string name = (directory / "quorl-bench-XXXXXX").string();
-    if (mkdtemp(name.data()) == nullptr) std::abort();
-    path_ = name;
-    database = SQLiteDatabase::open((path_ / "file.sqlite").string()).value();
+  explicit Site(const std::filesystem::path& directory) : directory_(directory) {
+    database = SQLiteDatabase::open((directory_.path() / "file.sqlite").string()).value();
     sqlite3_exec(database->dbPointer(), SQLTable<Metric>::createMetricTable, nullptr, nullptr, nullptr);
   }
-  ~Site() {
-    database.reset();
-    std::filesystem::remove_all(path_);
-  }
-  Site(const Site&) = delete;
-  Site& operator=(const Site&) = delete;
-
-  std::shared_ptr<SQLiteDatabase> database;
 
  private:
-  std::filesystem::path path_;
+  const bench::Directory directory_;  // goes after the database
+
+ public:
+  std::shared_ptr<SQLiteDatabase> database;
 };
 
 std::vector<Metric> makeRows(std::size_t count) {
@@ -86,7 +55,8 @@ std::vector<Metric> makeRows(std::size_t count) {
   return rows;
 }
 
-void wholePath(benchmark::State& state, Phone& phone, const std::filesystem::path& directory, std::size_t count) {
+void wholePath(benchmark::State& state, bench::Phone& phone, const std::filesystem::path& directory,
+               std::size_t count) {
   const Site site(directory);
   const std::vector<Metric> rows = makeRows(count);
   for ([[maybe_unused]] auto _ : state) {
@@ -134,57 +104,30 @@ void bareLoop(benchmark::State& state, const std::filesystem::path& directory, s
   state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(count));
 }
 
-class MedianReporter : public benchmark::ConsoleReporter {
- public:
-  void ReportRuns(const std::vector<Run>& runs) override {
-    ConsoleReporter::ReportRuns(runs);
-    for (const Run& run : runs)
-      if (run.aggregate_name == "median") medians[run.run_name.function_name] = run.GetAdjustedRealTime();
-  }
-
-  std::map<std::string, double> medians;
-};
-
 }  // namespace
 }  // namespace quorl
 
 int main(int argc, char** argv) {
   using namespace quorl;
-  // Interleaved repetitions spread what else the machine does over both sides.
-  std::vector<char*> arguments(argv, argv + argc);
-  std::string interleave = "--benchmark_enable_random_interleaving=true";
-  arguments.insert(arguments.begin() + 1, interleave.data());
-  int argumentCount = static_cast<int>(arguments.size());
-  benchmark::Initialize(&argumentCount, arguments.data());
-  if (benchmark::ReportUnrecognizedArguments(argumentCount, arguments.data())) return 1;
-
-  std::vector<std::string> directories{".", "/dev/shm"};
-  if (const char* directory = std::getenv("QUORL_BENCH_DIR")) directories = {directory};
-
-  Phone phone;
+  if (!bench::initialize(argc, argv)) return 1;
+  const std::vector<std::string> directories = bench::directories({".", "/dev/shm"});
+  bench::Phone phone;
   for (const std::string& directory : directories) {
     // A commit on a disk waits for the disk.
     const std::size_t count = directory == "/dev/shm" ? 1000 : 50;
-    const auto add = [&](const char* side, const auto& body) {
-      benchmark::RegisterBenchmark(("insert " + directory + side).c_str(), body)
-          ->Repetitions(kRepetitions)
-          ->ReportAggregatesOnly()
-          ->Iterations(1)
-          ->UseRealTime()
-          ->Unit(benchmark::kMillisecond);
-    };
-    add("/store", [&, directory, count](benchmark::State& state) { wholePath(state, phone, directory, count); });
-    add("/bare", [directory, count](benchmark::State& state) { bareLoop(state, directory, count); });
+    const std::string task = "insert " + directory;
+    bench::add(task + "/store", kRepetitions,
+               [&, directory, count](benchmark::State& state) { wholePath(state, phone, directory, count); });
+    bench::add(task + "/bare", kRepetitions,
+               [directory, count](benchmark::State& state) { bareLoop(state, directory, count); });
   }
-  MedianReporter reporter;
+  bench::MedianReporter reporter;
   benchmark::RunSpecifiedBenchmarks(&reporter);
 
   fmt::print("\nratio of medians, the store to the bare loop\n");
   for (const std::string& directory : directories) {
-    const auto store = reporter.medians.find("insert " + directory + "/store");
-    const auto bare = reporter.medians.find("insert " + directory + "/bare");
-    if (store == reporter.medians.end() || bare == reporter.medians.end()) continue;
-    fmt::print("  {:<12} {:.2f}\n", directory, store->second / bare->second);
+    const auto ratio = reporter.ratio("insert " + directory);
+    if (ratio) fmt::print("  {:<12} {:.2f}\n", directory, ratio->real);
   }
   return 0;
 }

@@ -4,16 +4,14 @@
 
 #include <cstdlib>
 #include <filesystem>
-#include <map>
 #include <memory>
 #include <string>
-#include <utility>
-#include <vector>
 
 #include <benchmark/benchmark.h>
 #include <fmt/format.h>
 #include <sqlite3.h>
 
+#include "StoreBench.h"
 #include "app/HardwareManager.h"
 #include "base/NotificationCenter.h"
 #include "base/SerialQueue.h"
@@ -106,16 +104,6 @@ void bareLoop(benchmark::State& state, Phone& phone) {
   }
 }
 
-class MedianReporter : public benchmark::ConsoleReporter {
- public:
-  void ReportRuns(const std::vector<Run>& runs) override {
-    ConsoleReporter::ReportRuns(runs);
-    for (const Run& run : runs)
-      if (run.aggregate_name == "median") medians[run.run_name.function_name] = run.GetAdjustedRealTime();
-  }
-  std::map<std::string, double> medians;
-};
-
 }  // namespace
 }  // namespace quorl
 
@@ -130,11 +118,11 @@ int main(int argc, char** argv) {
         ->Repetitions(quorl::kRepetitions)
         ->ReportAggregatesOnly();
   };
-  add("metric", [&](benchmark::State& state) { quorl::endToEnd(state, phone); });
-  add("bare", [&](benchmark::State& state) { quorl::bareLoop(state, phone); });
-  quorl::MedianReporter reporter;
+  add("metric/store", [&](benchmark::State& state) { quorl::endToEnd(state, phone); });
+  add("metric/bare", [&](benchmark::State& state) { quorl::bareLoop(state, phone); });
+  quorl::bench::MedianReporter reporter;
   benchmark::RunSpecifiedBenchmarks(&reporter);
-  fmt::print("\nratio of medians, one metric end to end to a bare loop over its rows\n  {:.2f}\n",
-             reporter.medians["metric"] / reporter.medians["bare"]);
+  if (const auto ratio = reporter.ratio("metric"))
+    fmt::print("\nratio of medians, one metric end to end to a bare loop over its rows\n  {:.2f}\n", ratio->real);
   return 0;
 }

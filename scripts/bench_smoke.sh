@@ -2,6 +2,9 @@
 # Runs each bench of a folder for a moment: it must start, run every case once and end well. No figure is judged.
 set -euo pipefail
 bin=$1
+scratch=$(mktemp -d)
+trap 'rm -rf "$scratch"' EXIT
+export QUORL_BENCH_DIR=$scratch QUORL_BENCH_ROWS=2000
 for bench in "$bin"/bench_*; do
   [ -x "$bench" ] || continue
   "$bench" --benchmark_min_time=0.001 >/dev/null 2>&1 || { echo "$(basename "$bench") failed" >&2; exit 1; }
