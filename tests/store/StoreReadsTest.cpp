@@ -321,6 +321,16 @@ TEST_F(StoreReadsTest, DailyHistoryHoldsTheReadingsOfTheCurrentSubscription) {
   EXPECT_EQ(values(history(kDaily).result), Row{"8"});
 }
 
+TEST_F(StoreReadsTest, DailyHistoryIsOfTheSubscriptionThatIsCurrentWhenItRunsOnPurpose) {
+  insert(reading("dl_freq", "7", "2026-01-05 07:00:00", 0));
+  insert(reading("dl_freq", "8", "2026-01-05 07:00:00", 1));
+  Read read;
+  database->fetchAttributeHistory("Serving Cell Info", "dl_freq", kDaily, into(read));
+  HardwareManager::shared().setCurrentSubsId(1);
+  platform.time.settle();
+  EXPECT_EQ(values(read.result), Row{"8"});
+}
+
 TEST_F(StoreReadsTest, WeeklyAndMonthlyHistoryAverageEachDayOverBothSubscriptionsOnPurpose) {
   insert(reading("dl_freq", "5", "2026-01-03 08:00:00", 0));
   insert(reading("dl_freq", "6", "2026-01-03 23:59:59", 1));
