@@ -81,6 +81,30 @@ class LocalizedNames {
   std::unordered_map<std::string, std::string> names_;
 };
 
+/// All rows of an export; nothing once one of them cannot be read.
+std::optional<ExportedMetrics> readExport(sqlite3* connection, sqlite3_stmt* statement) {
+  ExportedMetrics metrics;
+  StringTable& strings = Platform::current().strings;
+  WallClockReader dates;
+  // Entered once for all rows: each column would do so again, and nobody else uses the connection.
+  const ConnectionLock lock(connection);
+  while (sqlite3_step(statement) == SQLITE_ROW) {
+    RowReader row(statement);
+    ExportedMetric metric;
+    metric.metricTech = row.view(0);
+    metric.metricName = row.view(1);
+    metric.attributeNameNonLocalized = row.view(2);
+    metric.attributeValue = row.view(3);
+    metric.subsId = row.integer(4);
+    metric.metricId = row.view(5);
+    const std::optional<Date> date = dates.read(row.view(6));
+    if (row.hasNull() || !date) return std::nullopt;
+    metric.collectedOn = *date;
+    metrics.append(metric, strings);
+  }
+  return metrics;
+}
+
 }  // namespace
 
 void SQLiteDatabase::fetchAvailableMetrics(std::int32_t subsId, AvailableMetricsCompletion completion) {
@@ -221,30 +245,13 @@ void SQLiteDatabase::exportMetrics(AttributeDetailTimeFrame timeFrame, ExportCom
     if (!prepared) return failOnMain(std::move(completion), described(prepared.error()));
     // Left unfinalised on purpose, until the connection is closed.
     sqlite3_stmt* const statement = prepared->release();
-    ExportedMetrics metrics;
-    StringTable& strings = Platform::current().strings;
-    WallClockReader dates;
-    // Entered once for all rows: each column would do so again, and nobody else uses the connection.
-    const ConnectionLock lock(self.dbPointer());
-    while (sqlite3_step(statement) == SQLITE_ROW) {
-      RowReader row(statement);
-      ExportedMetric metric;
-      metric.metricTech = row.view(0);
-      metric.metricName = row.view(1);
-      metric.attributeNameNonLocalized = row.view(2);
-      metric.attributeValue = row.view(3);
-      metric.subsId = row.integer(4);
-      metric.metricId = row.view(5);
-      const std::optional<Date> date = dates.read(row.view(6));
-      if (row.hasNull() || !date) {
-        // Its snapshot must not outlive the read, or the journal could never be taken back.
-        sqlite3_reset(statement);
-        return completion({}, emptyQueryResult());
-      }
-      metric.collectedOn = *date;
-      metrics.append(metric, strings);
+    std::optional<ExportedMetrics> metrics = readExport(self.dbPointer(), statement);
+    if (!metrics) {
+      // Its snapshot must not outlive the read, or the journal could never be taken back.
+      sqlite3_reset(statement);
+      return completion({}, emptyQueryResult());
     }
-    succeedOnMain(std::move(completion), std::move(metrics));
+    succeedOnMain(std::move(completion), *std::move(metrics));
   });
 }
 
