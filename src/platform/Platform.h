@@ -3,6 +3,7 @@
 #include "base/Clock.h"
 #include "base/Queue.h"
 #include "platform/Services.h"
+#include "platform/SondrelLibrary.h"
 #include "platform/TelephonyClient.h"
 #include "platform/ZelkorClient.h"
 
@@ -30,6 +31,8 @@ struct Platform {
   Pasteboard& pasteboard;
   zelkor::client::Library& zelkor;
   HorvaneClientFactory& telephony;
+  /// Null on a device without log capture.
+  SondrelFactory* sondrel = nullptr;
 
   /// `platform` must outlive all use of the product. Null uninstalls; tests do so between cases.
   static void install(Platform* platform);
