@@ -15,13 +15,19 @@ SimulatedPhone::SimulatedPhone(Options options)
       backgroundQueue_(queues_.makeSerialQueue("background")),
       device_(std::move(options.device)),
       resources_(options.resources),
-      documents_(std::move(options.documents)),
+      documents_(options.documents),
       strings_(options.resources),
       console_(options.isConsoleShown),
       alerts_(alertConsole_, mainQueue_),
       telephony_(queues_),
       platform_{mainQueue_, *backgroundQueue_, queues_,    clock_, device_,     resources_, documents_, strings_,
                 console_,   alerts_,           analytics_, share_, pasteboard_, baseband_,  telephony_} {
+  if (device_.hasClass("Sondrel")) {
+    SondrelSimulator::Options capture;
+    capture.folder = options.documents / "Sondrel";
+    sondrel_.emplace(std::move(capture), mainQueue_, queues_, clock_);
+    platform_.sondrel = &*sondrel_;
+  }
   Platform::install(&platform_);
 }
 

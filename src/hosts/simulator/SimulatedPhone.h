@@ -2,12 +2,14 @@
 
 #include <filesystem>
 #include <memory>
+#include <optional>
 #include <vector>
 
 #include "base/Clock.h"
 #include "base/SerialQueue.h"
 #include "hosts/simulator/BasebandManager.h"
 #include "hosts/simulator/PhoneServices.h"
+#include "hosts/simulator/SondrelSimulator.h"
 #include "hosts/simulator/TelephonySimulator.h"
 #include "hosts/simulator/TrackedQueue.h"
 #include "platform/Platform.h"
@@ -63,6 +65,7 @@ class SimulatedPhone {
   KeptPasteboard pasteboard_;
   BasebandManager baseband_;
   TelephonySimulator telephony_;
+  std::optional<SondrelSimulator> sondrel_;  // where the device has such a class
   Platform platform_;
 };
 

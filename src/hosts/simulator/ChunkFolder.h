@@ -1,0 +1,50 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <deque>
+#include <filesystem>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <tl/expected.hpp>
+
+#include "platform/SondrelLibrary.h"
+
+namespace quorl::simulator {
+
+/// The chunk files of simulated captures in one folder, oldest first. A chunk has the size that was asked for, but it
+/// is a few lines of text and a hole behind them: it takes one block of the disk, whatever its size. One thread.
+class ChunkFolder {
+ public:
+  /// `capacity`: bytes that all chunks together may have before the disk counts as full.
+  ChunkFolder(std::filesystem::path folder, std::uint64_t capacity) : folder_(std::move(folder)), capacity_(capacity) {}
+
+  /// Makes the folder (0700) if it alone is missing, and takes over the chunks that lie there from an earlier run. What
+  /// else lies there is left alone.
+  tl::expected<void, SondrelError> open();
+  /// Writes the next chunk, readable for its owner alone. One that fails leaves nothing behind.
+  tl::expected<SondrelFileInformation, SondrelError> write(const std::string& configuration, std::uint64_t bytes,
+                                                           Date date);
+  /// Removes the oldest chunks until `count` are left.
+  void keepAtMost(std::size_t count);
+
+  std::size_t size() const { return chunks_.size(); }
+
+ private:
+  struct Chunk {
+    std::uint64_t number;
+    std::filesystem::path path;
+    std::uint64_t bytes;
+  };
+
+  const std::filesystem::path folder_;
+  const std::uint64_t capacity_;
+  std::deque<Chunk> chunks_;
+  std::uint64_t usedBytes_ = 0;
+  std::uint64_t lastNumber_ = 0;
+};
+
+}  // namespace quorl::simulator
