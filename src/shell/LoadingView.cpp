@@ -21,4 +21,9 @@ void LoadingView::hide() {
   changed_();
 }
 
+void LoadingView::stopAnimating() {
+  isAnimating_ = false;
+  changed_();
+}
+
 }  // namespace quorl

@@ -24,6 +24,8 @@ class LoadingView {
 
   void show();
   void hide();
+  /// Stops the spinner and leaves the text standing.
+  void stopAnimating();
 
   [[nodiscard]] Connection onChange(Signal<>::Handler handler) { return changed_.connect(std::move(handler)); }
 
