@@ -318,9 +318,9 @@ TEST_F(SondrelSimulatorTest, SettingsThatMakeNoSenseAreErrorStates) {
   library->start(SondrelConfiguration());
   time.settle();
   EXPECT_THAT(delegate->events, ElementsAre("state 2", "state 2", "state 2", "state 2", "state 2"));
-  EXPECT_THAT(delegate->errors,
-              ElementsAre("There is no log configuration \"Nonsense\".", HasSubstr("0 KB"), HasSubstr("1000000000000 KB"),
-                          "There cannot be 0 log files.", "There is no log configuration \"\"."));
+  EXPECT_THAT(delegate->errors, ElementsAre("There is no log configuration \"Nonsense\".", HasSubstr("0 KB"),
+                                            HasSubstr("1000000000000 KB"), "There cannot be 0 log files.",
+                                            "There is no log configuration \"\"."));
   EXPECT_FALSE(fs::exists(options.folder));
 }
 
