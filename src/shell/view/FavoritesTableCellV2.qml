@@ -1,0 +1,90 @@
+import QtQuick
+import Quorl
+
+// A row with three texts, a spinner and a separator: the first text over the two others.
+Item {
+    id: cell
+
+    property string titleText
+    property string subtitleText
+    property string valueText
+    property bool showsActivityIndicator: false
+    property bool showsSeparator: true
+
+    implicitHeight: Math.max(60, texts.implicitHeight + 3 * Theme.grid)
+    Accessible.role: Accessible.ListItem
+    Accessible.name: [titleText, subtitleText, valueText].filter(text => text).join(", ")
+
+    Column {
+        id: texts
+
+        anchors.left: parent.left
+        anchors.right: spinner.visible ? spinner.left : parent.right
+        anchors.leftMargin: Theme.margin
+        anchors.rightMargin: Theme.margin
+        anchors.verticalCenter: parent.verticalCenter
+        spacing: Theme.grid
+
+        Text {
+            objectName: "titleLabel"
+            width: parent.width
+            text: cell.titleText
+            textFormat: Text.PlainText
+            elide: Text.ElideMiddle
+            font.pixelSize: Theme.value
+            font.weight: Font.Medium
+            color: Theme.title
+            Accessible.ignored: true
+        }
+        Item {
+            width: parent.width
+            height: Math.max(subtitle.height, value.height)
+
+            Text {
+                id: subtitle
+
+                objectName: "subtitleLabel"
+                width: parent.width - value.width - Theme.grid * 2
+                text: cell.subtitleText
+                textFormat: Text.PlainText
+                elide: Text.ElideRight
+                font.pixelSize: Theme.caption
+                color: Theme.header
+                Accessible.ignored: true
+            }
+            Text {
+                id: value
+
+                objectName: "valueLabel"
+                anchors.right: parent.right
+                width: Math.min(implicitWidth, parent.width * 0.6)
+                text: cell.valueText
+                textFormat: Text.PlainText
+                elide: Text.ElideRight
+                horizontalAlignment: Text.AlignRight
+                font.pixelSize: Theme.caption
+                color: Theme.subtitleNumbers
+                Accessible.ignored: true
+            }
+        }
+    }
+    ActivityIndicator {
+        id: spinner
+
+        anchors.right: parent.right
+        anchors.rightMargin: Theme.margin
+        anchors.verticalCenter: parent.verticalCenter
+        visible: cell.showsActivityIndicator
+        isAnimating: visible
+    }
+    Rectangle {
+        objectName: "separatorView"
+        anchors.left: parent.left
+        anchors.right: parent.right
+        anchors.leftMargin: Theme.margin
+        anchors.bottom: parent.bottom
+        height: 1
+        visible: cell.showsSeparator
+        color: Theme.line
+    }
+}
