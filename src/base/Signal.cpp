@@ -16,7 +16,7 @@ Connection SignalCore::connect(std::function<void(const void*)> handler) {
   return Connection(std::make_shared<boost::signals2::scoped_connection>(slots_->signal.connect(std::move(handler))));
 }
 
-void SignalCore::emit(const void* arguments) {
+void SignalCore::tell(const void* arguments) {
   // A handler may destroy the signal's owner.
   const std::shared_ptr<Slots> slots = slots_;
   slots->signal(arguments);

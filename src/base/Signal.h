@@ -30,7 +30,7 @@ class SignalCore {
   SignalCore& operator=(const SignalCore&) = delete;
 
   Connection connect(std::function<void(const void* arguments)> handler);
-  void emit(const void* arguments);
+  void tell(const void* arguments);
 
  private:
   struct Slots;
@@ -51,7 +51,7 @@ class Signal {
   }
   void operator()(Args... args) {
     const std::tuple<Args...> arguments(args...);
-    core_.emit(&arguments);
+    core_.tell(&arguments);
   }
 
  private:
