@@ -12,3 +12,7 @@ if(QUORL_SANITIZE MATCHES "thread")
   # GCC warns that the thread sanitizer does not see std::atomic_thread_fence, which Asio uses.
   add_compile_options(-Wno-tsan)
 endif()
+if(QUORL_FUZZ)
+  # Coverage in everything that a target reaches is what steers the fuzzer.
+  add_compile_options(-fsanitize=fuzzer-no-link -gline-tables-only)
+endif()
