@@ -1,20 +1,15 @@
 #pragma once
 
 #include <array>
-#include <cstddef>
 #include <cstdint>
-#include <filesystem>
-#include <istream>
 #include <string>
-#include <string_view>
 #include <variant>
 #include <vector>
 
 #include "hosts/simulator/network/Cell.h"
 #include "hosts/simulator/network/ModemState.h"
 
-// A scenario: a small radio network, a way through it, the SIMs, and what its user does. docs/scenarios.md tells the
-// text form.
+// A scenario: a small radio network, a way through it, the SIMs, and what its user does.
 
 namespace quorl::simulator::network {
 
@@ -73,10 +68,9 @@ enum class RouteEnd : std::uint8_t { Stop, Loop, Return };
 struct Sim {
   bool isPresent = false;
   std::uint8_t operatorIndex = 0;
-  std::vector<std::uint8_t> roaming;    // operators that take it as a guest
-  std::vector<std::uint8_t> forbidden;  // operators that refuse it
-  double sessionsPerHour = 0;           // data sessions besides the script
-  double sessionSeconds = 10;           // their mean length
+  std::vector<std::uint8_t> roaming;  // operators that take it as a guest; all others refuse it
+  double sessionsPerHour = 0;         // data sessions besides the script
+  double sessionSeconds = 10;         // their mean length
   double callsPerHour = 0;
   double talkSeconds = 60;
   bool hasVoiceOverLte = true;  // else a call falls back
@@ -151,25 +145,5 @@ struct Scenario {
   std::array<Sim, 2> sims;
   std::vector<ScriptStep> steps;  // in the order of the file
 };
-
-/// What is wrong with a line.
-struct ScenarioProblem {
-  std::string file;
-  std::size_t line = 0;  // from 1; 0 for the file as a whole
-  std::string reason;
-};
-
-/// "city.scenario:3: no layer of that name: b33".
-std::string logText(const ScenarioProblem& problem);
-
-struct ScenarioReading {
-  Scenario scenario;                      // to be used only without problems
-  std::vector<ScenarioProblem> problems;  // in the order of the lines, those of the whole file last
-};
-
-/// Reads a scenario; `name` is for the problems. Never throws.
-ScenarioReading readScenario(std::istream& input, std::string_view name);
-/// The same from a file.
-ScenarioReading readScenario(const std::filesystem::path& file);
 
 }  // namespace quorl::simulator::network

@@ -1,0 +1,58 @@
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <optional>
+#include <vector>
+
+#include "hosts/simulator/network/Network.h"
+#include "hosts/simulator/network/RadioField.h"
+
+namespace quorl::simulator::network {
+
+/// A receiver of one subscription: filters what arrives (layer 3, TS 36.331 5.5.3.2), and works out of the filtered
+/// powers everything that depends on them, so that RSRP, RSRQ, RSSI and SINR of a cell always agree.
+class Receiver {
+ public:
+  Receiver(const Network& network, RadioField& field, std::uint64_t seed, std::uint8_t subscription);
+
+  /// Measures the cells of these operators. `load` is the share of the cells' capacity in use. A connection measures
+  /// often and filters more.
+  void listen(const std::vector<std::uint8_t>& operators, const Surroundings& place, SimulatedMs nowMs, double load,
+              bool isConnected);
+
+  /// Cells of a technology that were found by the last `listen`, strongest first.
+  const std::vector<CellMeasurement>& found(Technology technology) const;
+  /// A cell whether or not it would be found anew; at the lower ends of the ranges when nothing arrives of it.
+  CellMeasurement measure(const Cell& cell) const;
+  /// The strongest of the cells found on this cell's site and another carrier, or null.
+  const CellMeasurement* foundOnSite(const Cell& cell, std::uint32_t channel) const;
+
+  /// A cell in use, antenna by antenna, with what it can carry.
+  ServingMeasurement serve(const Cell& cell);
+
+ private:
+  struct Heard {
+    double power = 0;   // filtered, dBm
+    double linear = 0;  // mW
+    SimulatedMs atMs = 0;
+    std::uint8_t beam = 0;
+    bool isHeard = false;
+  };
+
+  void addToChannels(const Cell& cell, const Heard& heard);
+
+  const Network& network_;
+  RadioField& field_;
+  RandomStream antennas_;
+  std::vector<Heard> heard_;            // by cell
+  std::vector<std::uint16_t> now_;      // cells of the last round
+  std::vector<double> channelPower_;    // by channel: sum of power and use, mW
+  std::vector<double> channelDisturb_;  // by channel: sum of what disturbs others, mW
+  std::array<std::vector<CellMeasurement>, 5> found_;
+  std::array<double, 4> antennaState_{};
+  SimulatedMs nowMs_ = 0;
+  double load_ = 0;
+};
+
+}  // namespace quorl::simulator::network
