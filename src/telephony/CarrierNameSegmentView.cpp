@@ -1,5 +1,7 @@
 #include "telephony/CarrierNameSegmentView.h"
 
+#include <cmath>
+#include <numbers>
 #include <utility>
 
 #include "app/HardwareManager.h"
@@ -16,6 +18,15 @@ void SelectedTitle::set(std::string value) {
 TabButton::TabButton(std::shared_ptr<SelectedTitle> selected, std::size_t selectedIndex, std::string title,
                      std::shared_ptr<const HorvaneViewModel> root)
     : selected_(std::move(selected)), selectedIndex_(selectedIndex), title_(std::move(title)), root_(std::move(root)) {}
+
+double TabButton::springProgress(double seconds) {
+  if (seconds <= 0) return 0;
+  if (seconds >= kSpringDurationS) return 1;
+  const double frequency = 2 * std::numbers::pi / kSpringResponseS;
+  const double decay = kSpringDampingFraction * frequency;
+  const double swing = frequency * std::sqrt(1 - kSpringDampingFraction * kSpringDampingFraction);
+  return 1 - std::exp(-decay * seconds) * (std::cos(swing * seconds) + decay / swing * std::sin(swing * seconds));
+}
 
 bool TabButton::isSelected() const {
   return selected_->value() == title_ || (selected_->value().empty() && selectedIndex_ == 0);

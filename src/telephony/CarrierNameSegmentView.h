@@ -35,6 +35,10 @@ class TabButton {
   // The spring of a press, without blending.
   static constexpr double kSpringResponseS = 0.55;
   static constexpr double kSpringDampingFraction = 0.825;
+  /// After this time the spring is within a thousandth of its end.
+  static constexpr double kSpringDurationS = 0.8;
+  /// How much of its way the capsule has gone after `seconds`; a little more than 1 where it swings over.
+  static double springProgress(double seconds);
 
   TabButton(std::shared_ptr<SelectedTitle> selected, std::size_t selectedIndex, std::string title,
             std::shared_ptr<const HorvaneViewModel> root);

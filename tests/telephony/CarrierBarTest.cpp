@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <memory>
 #include <string>
 #include <utility>
@@ -250,6 +251,17 @@ TEST(HorvaneMetricDetailsTest, EachBandRowIsOneCellWithItsValueAndNoSecondText) 
   EXPECT_EQ(grid.cellAt(1).mainText, "78");
   EXPECT_EQ(grid.cellAt(0).secondText, "");
   EXPECT_TRUE(grid.cellAt(0).isSecondTextHidden());
+}
+
+TEST(TabButtonTest, TheCapsuleSwingsALittleOverAndSettles) {
+  EXPECT_EQ(TabButton::springProgress(0), 0);
+  double highest = 0;
+  for (double seconds = 0.01; seconds < TabButton::kSpringDurationS; seconds += 0.01)
+    highest = std::max(highest, TabButton::springProgress(seconds));
+  EXPECT_GT(highest, 1.005);
+  EXPECT_LT(highest, 1.02);
+  EXPECT_NEAR(TabButton::springProgress(TabButton::kSpringDurationS - 0.001), 1, 0.001);
+  EXPECT_EQ(TabButton::springProgress(TabButton::kSpringDurationS), 1);
 }
 
 }  // namespace

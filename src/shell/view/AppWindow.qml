@@ -26,4 +26,35 @@ ApplicationWindow {
         highlightedText: Theme.background
         placeholderText: Theme.header
     }
+
+    RootNavigationController {
+        id: root
+
+        objectName: "rootNavigation"
+        anchors.fill: parent
+        focus: true
+        shell: window.shell
+    }
+    AlertDialog {
+        alerts: window.shell.alerts
+    }
+
+    Shortcut {
+        sequences: ["Escape", StandardKey.Back]
+        enabled: !window.shell.alerts.isShowing && root.canGoBack
+        onActivated: root.goBack()
+    }
+    Repeater {
+        model: window.shell.menuBar.count
+
+        Item {
+            required property int index
+
+            Shortcut {
+                sequence: "Ctrl+" + (index + 1)
+                enabled: !window.shell.alerts.isShowing
+                onActivated: root.selectTab(index)
+            }
+        }
+    }
 }

@@ -1,9 +1,9 @@
 import QtQuick
 
-// What a screen may ask of the shell. The shell gives one to each screen that has a property `navigation`.
+// What a screen may ask of the shell. Each screen has a property `navigation`, which the shell sets.
 //
 // A component is a Component or the name of a QML file of this module, such as "MetricDetailsViewController". The new
-// item gets `properties`. A screen may have `property string title` (text of the bar over it) and
+// item gets `properties` and a `navigation` of its own, whatever `properties` say of that. A screen may have `property string title` (text of the bar over it) and
 // `property Flickable flickable` (its scrolling collapses the large title).
 QtObject {
     signal pushRequested(var component, var properties)

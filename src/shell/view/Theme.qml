@@ -23,6 +23,10 @@ QtObject {
     readonly property color line: Qt.alpha(buttonNormal, 0.3)
     readonly property color veil: Qt.alpha(isDark ? background : title, 0.5)
 
+    // The capsule of the chosen carrier is white in both palettes, so its text is dark in both.
+    readonly property color capsule: "white"
+    readonly property color capsuleText: isDark ? background : title
+
     readonly property real fontScale: Appearance.fontScale
     readonly property int largeTitle: Math.round(34 * fontScale)
     readonly property int section: Math.round(20 * fontScale)

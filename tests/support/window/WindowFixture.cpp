@@ -7,7 +7,10 @@
 #include <algorithm>
 #include <fstream>
 #include <mutex>
+#include <stdexcept>
 #include <utility>
+
+#include <fmt/ranges.h>
 
 #include "app/ApplicationLoop.h"
 #include "shell/Window.h"
@@ -59,7 +62,11 @@ std::vector<std::string> WarningCollector::take() {
 
 class SteppedAnimations final : public QAnimationDriver {
  public:
-  SteppedAnimations() { install(); }
+  SteppedAnimations() {
+    // Its time counts from the start of the animations that it drives.
+    connect(this, &QAnimationDriver::started, this, [this] { elapsed_ = 0; });
+    install();
+  }
   ~SteppedAnimations() override { uninstall(); }
 
   void advanceBy(std::chrono::milliseconds duration) {
@@ -84,7 +91,7 @@ WindowPhone::WindowPhone()
                 phone.documents,
                 phone.strings,
                 phone.console,
-                phone.alerts,
+                alerts_,
                 phone.analytics,
                 phone.share,
                 phone.pasteboard,
@@ -125,16 +132,15 @@ void WindowPhone::launch() {
   animations_ = std::make_unique<SteppedAnimations>();
   application_ = std::make_unique<AppDelegate>();
   ApplicationLoop(*application_).launch();
-  shell_ = std::make_unique<view::ShellBinding>(*application_->window());
+  shell_ = std::make_unique<view::ShellBinding>(*application_->window(), alerts_);
   engine_ = std::make_unique<QQmlApplicationEngine>();
   view::useQmlModule(*engine_);
   engine_->setInitialProperties(
       {{"shell", QVariant::fromValue(shell_.get())}, {"width", size_.width()}, {"height", size_.height()}});
   engine_->load(QUrl(view::kAppWindowUrl));
-  ASSERT_FALSE(engine_->rootObjects().isEmpty());
-  window_ = qobject_cast<QQuickWindow*>(engine_->rootObjects().constFirst());
-  ASSERT_NE(window_, nullptr);
-  ASSERT_TRUE(QTest::qWaitForWindowExposed(window_));
+  window_ = qobject_cast<QQuickWindow*>(engine_->rootObjects().value(0));
+  if (window_ == nullptr || !QTest::qWaitForWindowExposed(window_))
+    throw std::runtime_error(fmt::format("no window: {}", fmt::join(takeWarnings(), "; ")));
   settle();
 }
 
@@ -147,8 +153,9 @@ void WindowPhone::frame() {
 void WindowPhone::settle() {
   do {
     frame();
+    phone.time.advance(std::chrono::nanoseconds(0));
+    frame();
   } while (phone.time.settle() > 0);
-  frame();
 }
 
 void WindowPhone::pass(std::chrono::milliseconds duration) {

@@ -101,6 +101,7 @@ class WindowPhone {
   void frame();
 
   WarningCollector warnings_;
+  view::AlertsBinding alerts_;
   Platform platform_;
   std::unique_ptr<AppDelegate> application_;
   std::unique_ptr<view::ShellBinding> shell_;

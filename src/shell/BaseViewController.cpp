@@ -1,0 +1,97 @@
+#include "shell/BaseViewController.h"
+
+#include "app/HardwareManager.h"
+#include "base/FatalStop.h"
+#include "shell/NotificationNames.h"
+#include "store/PersistanceStore.h"
+
+namespace quorl {
+namespace {
+
+const char* titleOf(BaseViewNavigationIndexes index) {
+  switch (index) {
+    case BaseViewNavigationIndexes::first:
+      return "Dashboard";
+    case BaseViewNavigationIndexes::second:
+      return "All Metrics";
+    case BaseViewNavigationIndexes::third:
+      return "Sondrel";
+  }
+  fatalStop("BaseViewNavigationIndexes: no such case");
+}
+
+int numberOfSegments(const HardwareManager& hardware) {
+  const bool hasThird = (hardware.isInternalBuild() || hardware.isCarrierBuild()) && hardware.isMavDevice() &&
+                        hardware.isSondrelCompatible();
+  return hasThird ? 3 : 2;
+}
+
+}  // namespace
+
+void BaseViewController::viewDidLoad() {
+  if (isViewLoaded_) return;
+  isViewLoaded_ = true;
+  title_ = titleOf(BaseViewNavigationIndexes::first);
+  prefersLargeTitles_ = true;
+  menuBar();
+  const HardwareManager& hardware = HardwareManager::shared();
+  hasExportButton_ = hardware.isCarrierBuild() || hardware.isInternalBuild();
+  horvaneViewModel_ = std::make_shared<HorvaneViewModel>();
+  carrierBar_ = std::make_unique<CarrierNameSegmentView>(horvaneViewModel_);
+  embed(BaseViewNavigationIndexes::first);
+  carrierObservation_ = NotificationCenter::defaultCenter().observe(
+      notification::kCarrierUpdate,
+      [this](const Notification& update) { updateFromCarrierNotification(update, horvaneViewModel_.get()); });
+}
+
+void BaseViewController::viewWillAppear() {
+  if (isViewLoaded_) embed(currentlySelectedIndex_);
+}
+
+const std::shared_ptr<MenuBar>& BaseViewController::menuBar() {
+  if (!menuBar_) {
+    menuBar_ = MenuBar::make(numberOfSegments(HardwareManager::shared()));
+    menuBar_->setDelegate(weak_from_this());
+  }
+  return menuBar_;
+}
+
+const std::shared_ptr<DashboardViewController>& BaseViewController::dashboardViewController() {
+  if (!dashboardViewController_) dashboardViewController_ = DashboardViewController::make(persistanceStore_);
+  return dashboardViewController_;
+}
+
+const std::shared_ptr<AllMetricsViewController>& BaseViewController::firstLevelViewController() {
+  if (!firstLevelViewController_) firstLevelViewController_ = AllMetricsViewController::make(persistanceStore_);
+  return firstLevelViewController_;
+}
+
+void BaseViewController::menuBarDidSelectItemAt(std::size_t index) {
+  if (index >= static_cast<std::size_t>(menuBar()->numberOfSegments())) return;
+  const auto chosen = static_cast<BaseViewNavigationIndexes>(index);
+  if (chosen == currentlySelectedIndex_) return;
+  title_ = titleOf(chosen);
+  currentlySelectedIndex_ = chosen;
+  isExportButtonHidden_ = chosen == BaseViewNavigationIndexes::third;
+  embed(chosen);
+  changed_();
+}
+
+void BaseViewController::embed(BaseViewNavigationIndexes index) {
+  switch (index) {
+    case BaseViewNavigationIndexes::first:
+      dashboardViewController();
+      return;
+    case BaseViewNavigationIndexes::second:
+      firstLevelViewController()->viewWillAppear();
+      return;
+    case BaseViewNavigationIndexes::third:
+      return;
+  }
+}
+
+void BaseViewController::exportTappedWithTapGestureRecognizer() {
+  presentExport_(ExportViewController::make(persistanceStore_));
+}
+
+}  // namespace quorl

@@ -1,0 +1,55 @@
+#pragma once
+
+#include <QAbstractListModel>
+#include <memory>
+
+#include <QtQml/qqmlregistration.h>
+
+#include "base/Signal.h"
+#include "shell/MenuBar.h"
+
+namespace quorl::view {
+
+/// The tab bar for QML: one row for each item. Main thread.
+class MenuBarBinding final : public QAbstractListModel {
+  Q_OBJECT
+  QML_ELEMENT
+  QML_UNCREATABLE("made by the shell")
+  Q_PROPERTY(int selectedIndex READ selectedIndex NOTIFY selected)
+  Q_PROPERTY(int count READ count CONSTANT)
+  Q_PROPERTY(double multiplier READ multiplier CONSTANT)
+  Q_PROPERTY(double barHeight READ barHeight CONSTANT)
+  Q_PROPERTY(double markerHeight READ markerHeight CONSTANT)
+  Q_PROPERTY(int durationMs READ durationMs CONSTANT)
+
+ public:
+  enum Role { ImageNameRole = Qt::UserRole, IsSelectedRole, TintRole, NameRole };
+
+  explicit MenuBarBinding(std::shared_ptr<MenuBar> bar, QObject* parent = nullptr);
+
+  int rowCount(const QModelIndex& parent = {}) const override;
+  QVariant data(const QModelIndex& index, int role) const override;
+  QHash<int, QByteArray> roleNames() const override;
+
+  int selectedIndex() const { return static_cast<int>(bar_->selectedIndex()); }
+  int count() const { return bar_->numberOfSegments(); }
+  double multiplier() const { return bar_->segmentWidthMultiplier(); }
+  double barHeight() const { return MenuBar::height; }
+  double markerHeight() const { return MenuBar::horizontalViewBarHeight; }
+  /// Of the marker's movement.
+  int durationMs() const;
+
+  Q_INVOKABLE void press(int index);
+  /// See `MenuBar::markerProgress`.
+  Q_INVOKABLE double markerProgress(double part) const { return MenuBar::markerProgress(part); }
+
+ signals:
+  /// An item was selected, the same one or another: the marker is to move there.
+  void selected();
+
+ private:
+  const std::shared_ptr<MenuBar> bar_;
+  Connection selection_;
+};
+
+}  // namespace quorl::view
