@@ -1,7 +1,9 @@
 #include "hosts/simulator/network/Arithmetic.h"
 
+#include <array>
 #include <bit>
 #include <cmath>
+#include <cstddef>
 #include <cstdint>
 
 namespace quorl::simulator::network {
@@ -64,6 +66,21 @@ double tenTo(double x) {
   return exponential(x * kLn10);
 }
 
+double fromCentiDecibels(int centi) {
+  // Whole decibels times hundredths.
+  struct Tables {
+    std::array<double, 400> whole{};
+    std::array<double, 100> parts{};
+    Tables() {
+      for (int i = 0; i < 400; ++i) whole[static_cast<std::size_t>(i)] = fromDecibels(i - 300);
+      for (int i = 0; i < 100; ++i) parts[static_cast<std::size_t>(i)] = fromDecibels(i / 100.0);
+    }
+  };
+  static const Tables kTables;
+  const auto above = static_cast<std::size_t>(centi + 30000);
+  return kTables.whole[above / 100] * kTables.parts[above % 100];
+}
+
 double angleOf(double x, double y) {
   const double across = x < 0 ? -x : x;
   const double up = y < 0 ? -y : y;
@@ -74,7 +91,8 @@ double angleOf(double x, double y) {
 }
 
 int toCenti(double value) {
-  return static_cast<int>(std::floor(value * 100.0 + 0.5));
+  // Cutting off is rounding down once everything is above zero.
+  return static_cast<int>(value * 100.0 + 1000000.5) - 1000000;
 }
 
 }  // namespace quorl::simulator::network

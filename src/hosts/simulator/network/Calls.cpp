@@ -107,8 +107,8 @@ void Calls::choosePath() {
       call.kind = needsFallback_ ? CallKind::FallenBack : CallKind::VoLte;
       break;
     case Technology::Nr:  // voice over NR needs a good cell, else the call goes to LTE
-      needsFallback_ = core_.state.serving->best.power < -9500;
-      call.kind = needsFallback_ ? CallKind::VoLte : CallKind::VoNr;
+      needsFallback_ = !core_.sim.hasVoiceOverLte || core_.state.serving->best.power < -9500;
+      call.kind = !core_.sim.hasVoiceOverLte ? CallKind::FallenBack : needsFallback_ ? CallKind::VoLte : CallKind::VoNr;
       break;
     case Technology::None:
     case Technology::Gsm:
@@ -159,7 +159,9 @@ void Calls::cellChanged(const Cell* from, const Cell* to) {
   }
   call.cell = to;
   if (stage_ == Stage::FallingBack && !core_.isConnected()) {
-    stage_ = Stage::Moved;
+    // From NR to LTE, and without voice there on to UMTS or GSM.
+    needsFallback_ = to->technology == Technology::Lte && !core_.sim.hasVoiceOverLte;
+    stage_ = needsFallback_ ? Stage::Access : Stage::Moved;
     call.technology = to->technology;
     if (!connection_.request(wanted_.isOutgoing ? RrcCause::MoVoice : RrcCause::MtAccess))
       finish(CallEnd::FallbackFailed, kTemporaryFailure);

@@ -22,8 +22,9 @@ ReselectionParameters reselectionParametersOf(const Cell& cell) {
       return {-104, 0, 6, 0, 0, 0, 0, 10, 5};
     case Technology::Umts:
       return {-115, -18, 4, 10, 8, 6, 8, 6, 1};
+    case Technology::Nr:  // entered late and left late, or each shadow would change the core network
+      return {-122, -20, 4, 62, 10, 8, 20, 8, 2};
     case Technology::Lte:
-    case Technology::Nr:
     case Technology::None:
       break;
   }
@@ -116,7 +117,7 @@ void Camping::search() {
 void Camping::camp(const Cell& cell, event::ChangeReason reason) {
   const bool isOtherTechnology = core_.state.technology != cell.technology;
   if (isOtherTechnology && core_.state.rrc != RrcState::None) {
-    forgetConnection();
+    core_.tellConnectionEnded(event::ConnectionEnd::Release);
     enter(RrcState::None, RrcCause::None);
   }
   readSystemInformation(cell);
@@ -143,6 +144,7 @@ void Camping::take(const Cell& cell, event::ChangeReason reason) {
   core_.operators.assign(1, core_.network.operatorOf(cell));
   state.serving = core_.receiver.serve(cell);
   state.reselection = reselectionParametersOf(cell);
+  if (from != nullptr && from->technology != cell.technology) state.transmitPower = state.transmitPowerControl = 0;
   std::erase_if(state.neighbours, [&](const CellMeasurement& neighbour) { return neighbour.cell == &cell; });
   if (from != nullptr && from->technology != cell.technology) core_.measure();
   candidates_.clear();
@@ -152,18 +154,10 @@ void Camping::take(const Cell& cell, event::ChangeReason reason) {
   for (RadioUser* user : core_.users) user->cellChanged(from, &cell);
 }
 
-void Camping::forgetConnection() {
-  if (core_.state.rrc != RrcState::CellPch && core_.state.rrc != RrcState::UraPch) return;
-  ++core_.state.counters.connectionsReleased;
-  const ConnectionUse& use = core_.state.use;
-  core_.emit(event::ConnectionEnded{core_.state.technology, core_.cell(), event::ConnectionEnd::Release,
-                                    core_.now() - use.sinceMs, use, false});
-}
-
 void Camping::leave() {
   const Cell* from = core_.cell();
   if (from == nullptr) return;
-  forgetConnection();
+  core_.tellConnectionEnded(event::ConnectionEnd::Release);
   enter(RrcState::None, RrcCause::NoService);
   core_.state.serving.reset();
   core_.state.technology = Technology::None;

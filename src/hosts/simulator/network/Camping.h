@@ -48,8 +48,6 @@ class Camping {
   void scanForCdma(bool isNeeded);
   bool isBetter(const CellMeasurement& candidate) const;
   void readSystemInformation(const Cell& cell);
-  /// A UMTS connection that only waits for pages ends without a word when its cell is left.
-  void forgetConnection();
 
   struct Candidate {
     std::uint16_t cell;

@@ -16,6 +16,7 @@ constexpr Centi kGroupDrop = -11500;  // A2
 constexpr Centi kGroupOffset = 400;   // A3 between NR cells
 constexpr SimulatedMs kGroupTriggerMs = 320;
 constexpr SimulatedMs kWeakMs = 640;
+constexpr SimulatedMs kRecoveryMs = 1000;
 constexpr SimulatedMs kQuietMs = 2000;
 constexpr std::uint16_t kT310Ms = 1000;
 
@@ -135,8 +136,9 @@ void Carriers::measureGroup() {
   group.serving = core_.receiver.serve(*before.cell);
   const CellMeasurement& now = group.serving.best;
   followBeam(before, now);
-  if (now.sinr < -600) {
+  if (now.sinr < -600 && core_.now() - recoveryMs_ >= kRecoveryMs) {
     // The serving beam fails before the cell does: TS 38.321 5.17.
+    recoveryMs_ = core_.now();
     ++group.beamFailures;
     ++state.counters.beamFailures;
     if (connection_.tryAccess(*now.cell, event::RachReason::BeamRecovery, false)) ++group.beamRecoveries;
@@ -233,8 +235,12 @@ void Carriers::changeGroup(const Cell& cell) {
   core_.say(Kind::MeasurementReport, true, 1, 20);
   core_.say(Kind::Reconfiguration, false, 1, 180);
   if (!connection_.tryAccess(cell, event::RachReason::SecondaryGroup, false)) {
-    ++core_.state.counters.secondaryGroupFailures;
+    Counters& counters = core_.state.counters;
+    ++counters.secondaryGroupFailures;
+    ++counters.nrLinkFailures;
     core_.emit(event::SecondaryGroupAdded{&cell, false, true});
+    core_.emit(event::RadioLinkFailed{&cell, event::LinkFailureReason::RandomAccess, kT310Ms,
+                                      core_.state.nr->serving.best.power, true});
     removeGroup(event::GroupRemoval::LinkFailure);
     return;
   }

@@ -39,6 +39,7 @@ class Carriers final : public RadioUser {
   SimulatedMs groupSinceMs_ = 0;
   SimulatedMs weakSinceMs_ = 0;
   SimulatedMs beamSinceMs_ = 0;
+  SimulatedMs recoveryMs_ = 0;
   SimulatedMs quietSinceMs_ = 0;  // no data
   std::uint32_t outOfSync_ = 0;
   std::uint32_t strangeBeams_ = 0;

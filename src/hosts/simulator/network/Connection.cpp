@@ -167,6 +167,7 @@ void Connection::begin(RrcCause cause) {
     core_.say(Kind::ConnectionSetupComplete, true, 1, static_cast<std::uint16_t>(20 + core_.random.below(80)));
   }
   ++state.counters.connectionsCompleted;
+  core_.hasConnection = true;
   state.use = ConnectionUse{};
   state.use.sinceMs = core_.now();
   camping_.enter(usesCellStates(state.technology) ? RrcState::CellDch : RrcState::Connected, cause);
@@ -235,7 +236,7 @@ void Connection::inactive() {
       if (core_.state.technology == Technology::Nr) {
         core_.say(Kind::ConnectionRelease, false, 1, 30);  // with suspension
         for (RadioUser* user : core_.users) user->connectionEnding(RrcCause::ReleaseInactivity);
-        tellEnded(event::ConnectionEnd::Release);
+        core_.tellConnectionEnded(event::ConnectionEnd::Release);
         camping_.enter(RrcState::Inactive, RrcCause::ReleaseInactivity);
         connectedDrx(false);
         core_.after(Timer::Inactivity, 6 * kInactivityMs);
@@ -280,15 +281,8 @@ void Connection::released() {
   end(event::ConnectionEnd::Release, cause_);
 }
 
-void Connection::tellEnded(event::ConnectionEnd end) {
-  SubscriptionState& state = core_.state;
-  ++state.counters.connectionsReleased;
-  core_.emit(
-      event::ConnectionEnded{state.technology, core_.cell(), end, core_.now() - state.use.sinceMs, state.use, false});
-}
-
 void Connection::end(event::ConnectionEnd end, RrcCause cause) {
-  tellEnded(end);
+  core_.tellConnectionEnded(end);
   const Cell* target = target_;
   target_ = nullptr;
   idleAgain(cause);
@@ -312,11 +306,12 @@ void Connection::idleAgain(RrcCause cause) {
 void Connection::moveTo(const Cell& target) {
   const bool isOtherTechnology = target.technology != core_.state.technology;
   for (RadioUser* user : core_.users) user->connectionEnding(RrcCause::ReleaseHandoverOut);
-  tellEnded(event::ConnectionEnd::Handover);
+  core_.tellConnectionEnded(event::ConnectionEnd::Handover);
   if (isOtherTechnology) {
     camping_.enter(RrcState::None, RrcCause::ReleaseHandoverOut);
     core_.state.technology = target.technology;
   }
+  core_.hasConnection = true;
   core_.state.use = ConnectionUse{};
   core_.state.use.sinceMs = core_.now();
   if (isOtherTechnology)

@@ -49,7 +49,6 @@ class Connection {
   void accessFailed();
   void begin(RrcCause cause);
   void end(event::ConnectionEnd end, RrcCause cause);
-  void tellEnded(event::ConnectionEnd end);
   void connectedDrx(bool isConnected);
   void idleAgain(RrcCause cause);
   static bool usesCellStates(Technology technology) { return technology == Technology::Umts; }

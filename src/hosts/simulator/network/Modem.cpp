@@ -93,8 +93,7 @@ class Modem::World {
     place.motion = motion;
     place.zoneLoss = 0;
     for (const Zone& zone : scenario_.zones)
-      if (at.x >= zone.left && at.x <= zone.right && at.y >= zone.bottom && at.y <= zone.top)
-        place.zoneLoss += zone.loss;
+      if (zone.contains(at.x, at.y)) place.zoneLoss += zone.loss;
     warmUp();
   }
 

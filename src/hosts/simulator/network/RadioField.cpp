@@ -8,9 +8,10 @@
 namespace quorl::simulator::network {
 namespace {
 
-constexpr double kAntennaGain = 14.0;  // dBi, TR 36.814 table A.2.1.1-2
-constexpr double kBeamGain = 6.0;      // of an NR cell with several beams, over the sector
-constexpr double kWeakest = -150.0;
+constexpr double kAntennaGain = 14.0;             // dBi, TR 36.814 table A.2.1.1-2
+constexpr double kLeastCouplingLoss = 70.0;       // however near: TR 36.942 table 4.8
+constexpr double kBeamGain = 6.0;                 // of an NR cell with several beams, over the sector
+constexpr double kWeakest = -140.0;               // what is below disturbs nobody
 constexpr double kHalf = 0.70710678118654752440;  // root of 1/2: half of the variance
 
 /// Losses of walls rise with frequency as those of concrete, 5 + 4 f dB (TR 38.901 table 7.4.3-1); 1 at 2 GHz.
@@ -27,6 +28,7 @@ double sectorLoss(double degrees) {
 
 RadioField::RadioField(const Scenario& scenario, const Network& network, std::uint64_t seed)
     : network_(network),
+      zones_(scenario.zones),
       environment_(scenario.environment),
       shadows_(seed, 1),
       variations_(seed, 2),
@@ -44,6 +46,7 @@ void RadioField::buildMasts(Field& field, std::uint8_t operatorIndex, const Scen
     mast.x = first.x;
     mast.y = first.y;
     mast.drop = first.height - 1.5;
+    mast.zones = zonesAt(first.x, first.y);
     mast.shadow = shadows_.normal();
     mast.sight = shadows_.normal();
     while (cell < range.end && network_.cell(cell).siteIndex == site) {
@@ -86,8 +89,23 @@ void RadioField::moveOn(Field& field, double metres) {
   }
 }
 
+std::uint64_t RadioField::zonesAt(double x, double y) const {
+  std::uint64_t zones = 0;
+  for (std::size_t i = 0; i < zones_.size(); ++i)
+    if (zones_[i].contains(x, y)) zones |= std::uint64_t{1} << i;
+  return zones;
+}
+
+double RadioField::wallsBetween(const Mast& mast, std::uint64_t phoneZones) const {
+  double loss = 0;
+  for (std::size_t i = 0; i < zones_.size(); ++i)
+    if (((phoneZones & ~mast.zones) >> i & 1U) != 0) loss += zones_[i].loss / 100.0;
+  return loss;
+}
+
 void RadioField::fill(Field& field, const Surroundings& place) {
   field.received.clear();
+  phoneZones_ = zonesAt(place.x, place.y);
   // What averaging over a wide carrier and a measurement's period leaves of the fast fading.
   const double variation = place.motion == MotionState::Stationary ? 0.6 : 1.3;
   for (const Mast& mast : field.masts) fillMast(field, mast, place, variation);
@@ -105,7 +123,7 @@ void RadioField::fillMast(Field& field, const Mast& mast, const Surroundings& pl
   const double deviation =
       sight * PathLoss::deviationInSight(environment_) + (1.0 - sight) * PathLoss::deviationOutOfSight(environment_);
   const double shadow = deviation * kHalf * (field.commonShadow + mast.shadow);
-  const double wall = place.zoneLoss / 100.0;
+  const double wall = wallsBetween(mast, phoneZones_);
   for (const Carrier& carrier : mast.carriers) {
     const double loss = sight * carrier.loss.inSight(ground, logDistance) +
                         (1.0 - sight) * carrier.loss.outOfSight(ground, logDistance) + wall * carrier.wallFactor;
@@ -114,12 +132,15 @@ void RadioField::fillMast(Field& field, const Mast& mast, const Surroundings& pl
       double degrees = 0;
       if (sector.hasDirection) {
         degrees = (bearing - sector.azimuth) * 180.0 / kPi;
-        degrees -= 360.0 * std::floor((degrees + 180.0) / 360.0);
+        while (degrees > 180.0) degrees -= 360.0;
+        while (degrees < -180.0) degrees += 360.0;
       }
       Received received;
       received.cell = index;
       received.power = sector.elementPower / 100.0 + kAntennaGain - (sector.hasDirection ? sectorLoss(degrees) : 3.0) -
-                       loss + shadow + variation * variations_.normal();
+                       loss + shadow;
+      if (received.power < kWeakest) continue;
+      received.power += variation * variations_.normal();
       const std::uint8_t beams = network_.cell(index).beams;
       if (beams > 1) {
         // Beams share the 120 degrees of the sector evenly; each falls off by 3 dB towards the next.
@@ -129,7 +150,8 @@ void RadioField::fillMast(Field& field, const Mast& mast, const Surroundings& pl
         const double aside = 2.0 * (place01 - received.beam - 0.5);
         received.power += kBeamGain - 3.0 * aside * aside;
       }
-      if (received.power > kWeakest) field.received.push_back(received);
+      received.power = std::min(received.power, sector.elementPower / 100.0 - kLeastCouplingLoss);
+      field.received.push_back(received);
     }
   }
 }

@@ -27,8 +27,8 @@ class RadioField {
 
   RadioField(const Scenario& scenario, const Network& network, std::uint64_t seed);
 
-  /// All cells of an operator above -150 dBm, in the order of the network. Time and way must not run back. Asked twice
-  /// at a time it gives the same.
+  /// All cells of an operator above about -140 dBm, in the order of the network. Time and way must not run back. Asked
+  /// twice at a time it gives the same.
   const std::vector<Received>& receive(std::uint8_t operatorIndex, const Surroundings& place, SimulatedMs nowMs);
 
  private:
@@ -44,6 +44,7 @@ class RadioField {
     double drop = 0;  // of the antenna above the phone
     double shadow = 0;
     double sight = 0;
+    std::uint64_t zones = 0;  // it stands in, one bit each
     std::vector<Carrier> carriers;
   };
   struct Field {
@@ -60,11 +61,17 @@ class RadioField {
   void fill(Field& field, const Surroundings& place);
   void fillMast(Field& field, const Mast& mast, const Surroundings& place, double variation);
 
+  std::uint64_t zonesAt(double x, double y) const;
+  /// What the walls of the zones take in dB at 2 GHz: those around the phone and not around the mast.
+  double wallsBetween(const Mast& mast, std::uint64_t phoneZones) const;
+
   const Network& network_;
+  const std::vector<Zone> zones_;
   const Environment environment_;
   RandomStream shadows_;
   RandomStream variations_;
   std::vector<Field> fields_;  // one for each operator
+  std::uint64_t phoneZones_ = 0;
 };
 
 }  // namespace quorl::simulator::network

@@ -1,6 +1,7 @@
 #include "hosts/simulator/network/Receiver.h"
 
 #include <algorithm>
+#include <cstddef>
 
 #include "hosts/simulator/network/Arithmetic.h"
 #include "hosts/simulator/network/LinkAdaptation.h"
@@ -15,6 +16,10 @@ constexpr double kNoiseUmts = -108.16 + kNoiseFigure;
 constexpr double kNoiseGsm = -120.99 + kNoiseFigure;
 /// Errors of transmitter and receiver keep the ratio below 32 dB however strong the cell is.
 constexpr double kOwnDistortion = 0.00063;
+
+constexpr double kWeakestFound = -127.0;
+/// Cells of a technology whose signals a search tells apart in one round.
+constexpr std::size_t kMostLookedAt = 14;
 
 struct Range {
   double low;
@@ -107,47 +112,54 @@ Receiver::Receiver(const Network& network, RadioField& field, std::uint64_t seed
       antennas_(seed, 10U + subscription),
       heard_(network.cells().size()),
       channelPower_(network.channels()),
-      channelDisturb_(network.channels()) {}
+      channelDisturb_(network.channels()) {
+  for (const Cell& cell : network.cells()) noise_.push_back(fromDecibels(noiseOf(cell)));
+}
 
 void Receiver::listen(const std::vector<std::uint8_t>& operators, const Surroundings& place, SimulatedMs nowMs,
                       double load, bool isConnected) {
   nowMs_ = nowMs;
   load_ = load;
-  now_.clear();
   std::fill(channelPower_.begin(), channelPower_.end(), 0.0);
   std::fill(channelDisturb_.begin(), channelDisturb_.end(), 0.0);
-  for (auto& list : found_) list.clear();
+  for (auto& list : strongest_) list.clear();
   // Filter coefficient 4 of TS 36.331 for a connection; rounds in idle are six times as far apart.
   const double share = isConnected ? 0.5 : 0.8;
-  for (const std::uint8_t number : operators) {
-    for (const RadioField::Received& received : field_.receive(number, place, nowMs)) {
-      Heard& heard = heard_[received.cell];
-      const bool isFresh = !heard.isHeard || nowMs - heard.atMs > 3000;
-      heard.power = isFresh ? received.power : heard.power + share * (received.power - heard.power);
-      heard.linear = tenTo(heard.power / 10.0);
-      heard.atMs = nowMs;
-      heard.beam = received.beam;
-      heard.isHeard = true;
-      now_.push_back(received.cell);
-      addToChannels(network_.cell(received.cell), heard);
-    }
-  }
-  for (const std::uint16_t index : now_) {
-    if (heard_[index].power < -127.0) continue;
-    const CellMeasurement measurement = measure(network_.cell(index));
-    if (isFindable(measurement)) found_[static_cast<std::size_t>(measurement.cell->technology)].push_back(measurement);
-  }
-  for (auto& list : found_) {
-    std::sort(list.begin(), list.end(), [](const CellMeasurement& left, const CellMeasurement& right) {
-      return left.power != right.power ? left.power > right.power : left.cell->index < right.cell->index;
-    });
-  }
+  for (const std::uint8_t number : operators)
+    for (const RadioField::Received& received : field_.receive(number, place, nowMs)) hear(received, share);
+  find();
 }
 
-void Receiver::addToChannels(const Cell& cell, const Heard& heard) {
-  const std::uint16_t channel = network_.sector(cell.index).channelIndex;
+void Receiver::hear(const RadioField::Received& received, double share) {
+  Heard& heard = heard_[received.cell];
+  const bool isFresh = !heard.isHeard || nowMs_ - heard.atMs > 3000;
+  heard.power = isFresh ? received.power : heard.power + share * (received.power - heard.power);
+  heard.linear = fromCentiDecibels(toCenti(heard.power));
+  heard.atMs = nowMs_;
+  heard.beam = received.beam;
+  heard.isHeard = true;
+  const Cell& cell = network_.cell(received.cell);
+  const std::uint16_t channel = network_.sector(received.cell).channelIndex;
   channelPower_[channel] += heard.linear * occupancy(cell.technology, load_);
   channelDisturb_[channel] += heard.linear * (0.1 + 0.9 * load_);
+  if (heard.power > kWeakestFound) strongest_[static_cast<std::size_t>(cell.technology)].push_back(received.cell);
+}
+
+void Receiver::find() {
+  for (std::size_t technology = 0; technology < found_.size(); ++technology) {
+    found_[technology].clear();
+    std::vector<std::uint16_t>& cells = strongest_[technology];
+    const auto last = cells.begin() + static_cast<std::ptrdiff_t>(std::min(cells.size(), kMostLookedAt));
+    std::partial_sort(cells.begin(), last, cells.end(), [this](std::uint16_t left, std::uint16_t right) {
+      const double one = heard_[left].power;
+      const double other = heard_[right].power;
+      return one != other ? one > other : left < right;
+    });
+    for (auto cell = cells.begin(); cell != last; ++cell) {
+      const CellMeasurement measurement = measure(network_.cell(*cell));
+      if (isFindable(measurement)) found_[technology].push_back(measurement);
+    }
+  }
 }
 
 const std::vector<CellMeasurement>& Receiver::found(Technology technology) const {
@@ -159,8 +171,8 @@ CellMeasurement Receiver::measure(const Cell& cell) const {
   const bool isHeard = heard.isHeard && heard.atMs == nowMs_;
   const Range powers = powerRange(cell.technology);
   const double power = isHeard ? heard.power : powers.low;
-  const double linear = isHeard ? heard.linear : tenTo(power / 10.0);
-  const double noise = tenTo(noiseOf(cell) / 10.0);
+  const double linear = isHeard ? heard.linear : fromDecibels(power);
+  const double noise = noise_[cell.index];
   const std::uint16_t channel = network_.sector(cell.index).channelIndex;
   CellMeasurement result;
   result.cell = &cell;
@@ -183,7 +195,7 @@ CellMeasurement Receiver::measure(const Cell& cell) const {
     }
     case Technology::Umts:  // TS 25.215 5.1.5: Ec/N0 is RSCP over RSSI
       result.quality = within(toDecibels(linear / received), qualityRange(cell.technology));
-      result.sinr = result.quality;
+      result.sinr = std::max(result.quality, within(-100.0, kSinrRange));
       result.rssi = toCenti(toDecibels(received));
       break;
     case Technology::None:
@@ -192,14 +204,6 @@ CellMeasurement Receiver::measure(const Cell& cell) const {
       break;
   }
   return result;
-}
-
-const CellMeasurement* Receiver::foundOnSite(const Cell& cell, std::uint32_t channel) const {
-  for (const CellMeasurement& measurement : found(cell.technology)) {
-    const Cell& other = *measurement.cell;
-    if (other.siteIndex == cell.siteIndex && other.downlinkChannel == channel) return &measurement;
-  }
-  return nullptr;
 }
 
 ServingMeasurement Receiver::serve(const Cell& cell) {

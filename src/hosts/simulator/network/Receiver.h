@@ -25,9 +25,6 @@ class Receiver {
   const std::vector<CellMeasurement>& found(Technology technology) const;
   /// A cell whether or not it would be found anew; at the lower ends of the ranges when nothing arrives of it.
   CellMeasurement measure(const Cell& cell) const;
-  /// The strongest of the cells found on this cell's site and another carrier, or null.
-  const CellMeasurement* foundOnSite(const Cell& cell, std::uint32_t channel) const;
-
   /// A cell in use, antenna by antenna, with what it can carry.
   ServingMeasurement serve(const Cell& cell);
 
@@ -40,17 +37,19 @@ class Receiver {
     bool isHeard = false;
   };
 
-  void addToChannels(const Cell& cell, const Heard& heard);
+  void hear(const RadioField::Received& received, double share);
+  void find();
 
   const Network& network_;
   RadioField& field_;
   RandomStream antennas_;
+  std::vector<double> noise_;           // by cell, mW
   std::vector<Heard> heard_;            // by cell
-  std::vector<std::uint16_t> now_;      // cells of the last round
   std::vector<double> channelPower_;    // by channel: sum of power and use, mW
   std::vector<double> channelDisturb_;  // by channel: sum of what disturbs others, mW
   std::array<std::vector<CellMeasurement>, 5> found_;
   std::array<double, 4> antennaState_{};
+  std::array<std::vector<std::uint16_t>, 5> strongest_;  // by technology, while they are looked through
   SimulatedMs nowMs_ = 0;
   double load_ = 0;
 };

@@ -206,7 +206,8 @@ void Registration::updateService() {
   RoamStatus roaming = RoamStatus::Off;
   const Cell* cell = core_.cell();
   if (cell != nullptr) {
-    const bool isServed = state.registration.state == RegistrationState::Registered;
+    const bool isServed =
+        state.registration.state == RegistrationState::Registered && state.registration.plmn == cell->plmn;
     status = isServed ? ServiceStatus::Service : ServiceStatus::Limited;
     domain = ServiceDomain::Camped;
     if (isServed)

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <array>
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <variant>
@@ -47,7 +48,10 @@ struct Site {
   std::vector<std::uint16_t> layers;    // indices into Scenario::layers
 };
 
-/// A rectangle that weakens everything outside of it: a building or a tunnel.
+/// Most zones of a scenario.
+inline constexpr std::size_t kMostZones = 64;
+
+/// A rectangle that weakens for the phone in it everything outside of it: a building or a tunnel.
 struct Zone {
   std::string name;
   double left = 0;
@@ -55,6 +59,8 @@ struct Zone {
   double right = 0;
   double top = 0;
   Centi loss = 0;
+
+  bool contains(double x, double y) const { return x >= left && x <= right && y >= bottom && y <= top; }
 };
 
 struct Waypoint {

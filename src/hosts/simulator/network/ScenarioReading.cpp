@@ -215,6 +215,7 @@ class Builder {
   }
 
   void zone(ScenarioLine& line) {
+    if (scenario_.zones.size() >= kMostZones) bad("more than {} zones", kMostZones);
     Zone added;
     added.name = line.word("a name");
     added.left = line.number("left", -kFarthest, kFarthest);

@@ -20,6 +20,13 @@ void take(std::vector<CellMeasurement>& list, const std::vector<CellMeasurement>
 
 }  // namespace
 
+void SubscriptionCore::tellConnectionEnded(event::ConnectionEnd end) {
+  if (!hasConnection) return;
+  hasConnection = false;
+  ++state.counters.connectionsReleased;
+  emit(event::ConnectionEnded{state.technology, cell(), end, now() - state.use.sinceMs, state.use, false});
+}
+
 void SubscriptionCore::measure() {
   receiver.listen(operators, phone.place, now(), phone.load, isConnected());
   state.neighbours.clear();

@@ -100,6 +100,7 @@ class SubscriptionCore {
   SubscriptionState state;
   std::vector<RadioUser*> users;
   std::vector<std::uint8_t> operators;  // that are listened to
+  bool hasConnection = false;           // set up, and its end not told yet
 
   SimulatedMs now() const { return phone.nowMs; }
   const Cell* cell() const { return state.serving ? state.serving->best.cell : nullptr; }
@@ -139,6 +140,8 @@ class SubscriptionCore {
     emit(event::AirMessage{on, kind, isUplink, bearer, length});
   }
 
+  /// Tells of the end of the connection, if there is one.
+  void tellConnectionEnded(event::ConnectionEnd end);
   /// Measures what is around, the serving cell included, and puts it into the state.
   void measure();
 
