@@ -21,7 +21,7 @@ class Fingerprint {
     add(static_cast<std::uint64_t>(state.rrc));
     add(static_cast<std::uint64_t>(state.service));
     add(static_cast<std::uint64_t>(state.transmitPower));
-    add(static_cast<std::uint64_t>(state.surroundings.x * 100.0));
+    add(static_cast<std::uint64_t>(static_cast<std::int64_t>(state.surroundings.x * 100.0)));
     add(static_cast<std::uint64_t>(state.surroundings.radioMilliCelsius));
     add(state.counters.downlinkBytes);
     add(state.registration.temporaryId);
