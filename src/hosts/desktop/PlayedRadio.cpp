@@ -1,0 +1,61 @@
+#include "hosts/desktop/PlayedRadio.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "TimeShift.h"
+#include "platform/ZelkorClient.h"
+
+namespace quorl::desktop {
+namespace {
+
+using std::chrono::milliseconds;
+
+/// Between the end of the recording and its next beginning.
+constexpr milliseconds kPause{1000};
+
+std::vector<simulator::TelephonyScriptStep> atSpeed(std::vector<simulator::TelephonyScriptStep> steps, double speed) {
+  for (simulator::TelephonyScriptStep& step : steps)
+    step.at = milliseconds(static_cast<milliseconds::rep>(static_cast<double>(step.at.count()) / speed));
+  return steps;
+}
+
+}  // namespace
+
+struct PlayedRadio::State {
+  std::vector<simulator::RecordedEvent> events;
+  double speed;
+  Phone phone;
+  std::size_t next = 0;
+};
+
+PlayedRadio::PlayedRadio(Programme programme, Phone phone)
+    : state_(std::make_shared<State>(State{std::move(programme.events), programme.speed, phone})) {
+  phone.telephony.play(atSpeed(std::move(programme.steps), programme.speed), phone.mainQueue);
+}
+
+PlayedRadio::~PlayedRadio() = default;
+
+void PlayedRadio::start() {
+  if (!state_->events.empty()) playNext(state_);
+}
+
+void PlayedRadio::playNext(const std::shared_ptr<State>& state) {
+  const auto timeOf = [&](std::size_t index) { return milliseconds(state->events[index].atMs.value_or(0)); };
+  const bool isAgain = state->next == state->events.size();
+  if (isAgain) state->next = 0;
+  const milliseconds before = isAgain ? -kPause : (state->next == 0 ? milliseconds(0) : timeOf(state->next - 1));
+  const auto wait = std::chrono::duration<double, std::milli>(timeOf(state->next) - before) / state->speed;
+  state->phone.mainQueue.asyncAfter(std::chrono::duration_cast<Queue::Duration>(std::max(wait, wait.zero())),
+                                    [weak = std::weak_ptr(state)] {
+                                      const auto self = weak.lock();
+                                      if (!self) return;
+                                      std::vector<simulator::RecordedEvent> event = {self->events[self->next++]};
+                                      tool::shiftToNow(event, self->phone.clock.now());
+                                      // Without a client it is gone, as on the device.
+                                      self->phone.baseband.deliver(zelkor::kEventMetric, event.front().message());
+                                      playNext(self);
+                                    });
+}
+
+}  // namespace quorl::desktop

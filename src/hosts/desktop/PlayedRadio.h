@@ -1,0 +1,48 @@
+#pragma once
+
+#include <chrono>
+#include <cstddef>
+#include <memory>
+#include <vector>
+
+#include "base/Clock.h"
+#include "base/Queue.h"
+#include "hosts/simulator/BasebandManager.h"
+#include "hosts/simulator/Recording.h"
+#include "hosts/simulator/TelephonySimulator.h"
+
+namespace quorl::desktop {
+
+/// What a simulated phone hears: a recording that is played over and over, and a telephony script that is played once.
+/// Main thread.
+class PlayedRadio {
+ public:
+  struct Programme {
+    std::vector<simulator::RecordedEvent> events;  // in order of time
+    std::vector<simulator::TelephonyScriptStep> steps;
+    double speed = 1;  // above 0
+  };
+  struct Phone {
+    simulator::BasebandManager& baseband;
+    simulator::TelephonySimulator& telephony;
+    Queue& mainQueue;
+    const Clock& clock;
+  };
+
+  /// The phone must outlive it. How the SIMs are found at the start is so from here on.
+  PlayedRadio(Programme programme, Phone phone);
+  ~PlayedRadio();
+  PlayedRadio(const PlayedRadio&) = delete;
+  PlayedRadio& operator=(const PlayedRadio&) = delete;
+
+  /// Starts to play. Each event bears the time of its delivery.
+  void start();
+
+ private:
+  struct State;
+  static void playNext(const std::shared_ptr<State>& state);
+
+  const std::shared_ptr<State> state_;
+};
+
+}  // namespace quorl::desktop

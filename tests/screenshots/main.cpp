@@ -1,0 +1,163 @@
+// Writes a picture of every screen, light and dark, on a phone and on a tablet, into a folder. The phone is a fake one
+// in virtual time that has heard the shipped recording for some days, so the same pictures come out every time.
+
+#include <QGuiApplication>
+#include <chrono>
+#include <filesystem>
+#include <iostream>
+#include <memory>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#include <fmt/format.h>
+
+#include "TimeShift.h"
+#include "hosts/simulator/Recording.h"
+#include "hosts/simulator/SondrelSimulator.h"
+#include "hosts/simulator/TelephonyScript.h"
+#include "shell/view/Appearance.h"
+#include "support/TimeZone.h"
+#include "support/window/WindowFixture.h"
+
+namespace quorl::test {
+namespace {
+
+using namespace std::chrono_literals;
+
+const std::filesystem::path kResources = std::filesystem::path(QUORL_SOURCE_DIR) / "resources";
+
+struct Look {
+  const char* name;
+  QSize size;
+  bool isDark;
+};
+
+class Photographer : public WindowPhone {
+ public:
+  Photographer(std::filesystem::path folder, Look look, const std::vector<simulator::RecordedEvent>& events)
+      : folder_(std::move(folder)), look_(look), events_(events) {
+    view::Appearance::shared().setDark(look.isDark);
+    setSize(look.size.width(), look.size.height());
+    isInternalBuild();
+    hasLogCapture();
+    const auto script = simulator::readTelephonyScript(kResources / "telephony" / "two-sims.jsonl");
+    for (const simulator::TelephonyScriptStep& step : script.steps)
+      if (step.at < 12s) telephony.perform(step.event);
+  }
+
+  void photographAll() {
+    launch();
+    hearForDays();
+    pass(16s);
+    picture("dashboard");
+    tap("manageButton");
+    pass(500ms);
+    picture("managing");
+    key(Qt::Key_Escape);
+    pass(500ms);
+    select(1);
+    picture("metrics");
+    openMetric("Rach Attempt");
+    picture("detail");
+    tap("graphButton");
+    pass(500ms);
+    tap("segment1");
+    pass(500ms);
+    picture("history");
+    key(Qt::Key_Escape);
+    pass(500ms);
+    key(Qt::Key_Escape);
+    pass(500ms);
+    tap("exportButton");
+    pass(500ms);
+    picture("export");
+    key(Qt::Key_Escape);
+    pass(500ms);
+    select(2);
+    tap("startButton");
+    pass(5s);
+    picture("capture");
+    tap("configButton");
+    pass(1s);
+    picture("capture-choice");
+  }
+  void photographUnknownChipset() {
+    phone.properties.texts.erase("BasebandChipset");
+    launch();
+    pass(1s);
+    picture("unknown-baseband");
+  }
+
+ private:
+  void select(int tab) {
+    tap("menuCell" + QString::number(tab));
+    pass(1s);
+  }
+  void openMetric(const QString& name) {
+    for (QQuickItem* row : findAll("metricRow")) {
+      if (row->property("name") != name) continue;
+      QMetaObject::invokeMethod(row, "clicked");
+      pass(1s);
+      return;
+    }
+    throw std::runtime_error(fmt::format("{} is not in the list", name.toStdString()));
+  }
+  /// The recording, twice a day for a week.
+  void hearForDays() {
+    const Date now = phone.time.now();
+    for (int halfDays = 13; halfDays >= 0; --halfDays) {
+      const Date begin = now - halfDays * 12h - 11min;
+      for (const simulator::RecordedEvent& event : events_) {
+        phone.time.setNow(begin + std::chrono::milliseconds(event.atMs.value_or(0)));
+        std::vector<simulator::RecordedEvent> heard = {event};
+        tool::shiftToNow(heard, phone.time.now());
+        phone.zelkor.deliver(zelkor::kEventMetric, heard.front().message());
+      }
+      phone.time.settle();
+    }
+    phone.time.setNow(now);
+  }
+  void picture(const std::string& name) {
+    const auto file = folder_ / fmt::format("{}-{}-{}.png", name, look_.name, look_.isDark ? "dark" : "light");
+    if (!grab().save(QString::fromStdString(file.string())))
+      throw std::runtime_error(fmt::format("{} could not be written", file.string()));
+    for (const std::string& warning : takeWarnings()) std::cerr << name << ": " << warning << '\n';
+  }
+
+  const std::filesystem::path folder_;
+  const Look look_;
+  const std::vector<simulator::RecordedEvent>& events_;
+};
+
+int photograph(const std::filesystem::path& folder) {
+  std::filesystem::create_directories(folder);
+  const ScopedTimeZone zone("UTC");
+  const ScopedLocale locale("en_US");
+  const auto recording = simulator::readRecording(kResources / "recordings" / "mav.jsonl");
+  if (!recording) throw std::runtime_error(recording.error());
+  for (const bool isDark : {false, true}) {
+    for (const Look look : {Look{"phone", {390, 844}, isDark}, Look{"tablet", {1024, 768}, isDark}})
+      Photographer(folder, look, recording->events).photographAll();
+    Photographer(folder, {"phone", {390, 844}, isDark}, recording->events).photographUnknownChipset();
+  }
+  return EXIT_SUCCESS;
+}
+
+}  // namespace
+}  // namespace quorl::test
+
+int main(int argc, char** argv) {
+  if (argc != 2) {
+    std::cerr << "usage: quorl-screenshots FOLDER\n";
+    return EXIT_FAILURE;
+  }
+  const std::filesystem::path folder = argv[1];
+  try {
+    const auto application = quorl::test::makeOffscreenApplication(argc, argv);
+    return quorl::test::photograph(folder);
+  } catch (const std::exception& error) {
+    std::cerr << "quorl-screenshots: " << error.what() << '\n';
+    return EXIT_FAILURE;
+  }
+}
