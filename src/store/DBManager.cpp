@@ -10,6 +10,7 @@
 #include "base/Log.h"
 #include "base/Uuid.h"
 #include "shell/LogCategories.h"
+#include "store/KeptReadings.h"
 #include "store/MetricStatements.h"
 #include "store/WorkItems.h"
 
@@ -62,6 +63,7 @@ tl::expected<std::shared_ptr<SQLiteDatabase>, SQLiteError> SQLiteDatabase::open(
 
 SQLiteDatabase::SQLiteDatabase(sqlite3* dbPointer)
     : dbPointer_(dbPointer),
+      keptReadings_(std::make_unique<store_detail::KeptReadings>(dbPointer)),
       queue_(Platform::current().queues.makeSerialQueue("com.ardent.dbmanager.queue -" + Uuid::make().string())),
       handOver_(std::make_shared<store_detail::MainHandOver>(Platform::current().mainQueue)) {
   // A connection that stays out of WAL mode works on.
@@ -90,6 +92,7 @@ std::string SQLiteDatabase::libraryMessage() const {
 void SQLiteDatabase::createTable(std::string sql, std::string tableName, WriteCompletion completion) {
   enqueueWrite(*this, [sql = std::move(sql), tableName = std::move(tableName),
                        completion = std::move(completion)](SQLiteDatabase& self) {
+    self.keptReadings_->giveUp();
     StatementHandle statement;
     if (auto prepared = self.prepareStatement(sql.c_str())) {
       statement = std::move(*prepared);
@@ -135,6 +138,10 @@ std::optional<SQLiteError> SQLiteDatabase::insert(const Metric& metric) {
   if (!statement) return statement.error();
   if (auto error = bind(statement->get(), metric, collectedOn)) return error;
   if (sqlite3_step(statement->get()) != SQLITE_DONE) return SQLiteError{SQLiteError::Case::Prepare, libraryMessage()};
+  // What is bound ends at its first zero byte.
+  keptReadings_->hasInserted({metric.metricTech.c_str(), metric.metricName.c_str(), metric.attributeName.c_str(),
+                              metric.attributeValue.c_str(), metric.attributeValueType.c_str(), metric.graphable,
+                              metric.metricId.c_str(), metric.subsId, collectedOn});
   return std::nullopt;
 }
 
@@ -142,6 +149,7 @@ void SQLiteDatabase::insertMetric(Metric metric, WriteCompletion completion) {
   enqueueInsert(*this, [metric = std::move(metric), completion = std::move(completion)](
                            SQLiteDatabase& self, store_detail::MainHandOver& handOver) mutable {
     std::optional<SQLiteError> error = self.insert(metric);
+    if (error) self.keptReadings_->giveUp();
     handOver.add([completion = std::move(completion), error = std::move(error)] {
       completion(!error, error);
       if (!error) databaseLog.log("successfully inserted metric to db");
@@ -151,6 +159,7 @@ void SQLiteDatabase::insertMetric(Metric metric, WriteCompletion completion) {
 
 void SQLiteDatabase::deleteOlderRows(SuccessCompletion completion) {
   enqueueWrite(*this, [completion = std::move(completion)](SQLiteDatabase& self) mutable {
+    self.keptReadings_->giveUp();
     bool success = false;
     if (const auto statement = self.prepareStatement(kDeleteOlderRowsStatement)) {
       success = sqlite3_step(statement->get()) == SQLITE_DONE;
@@ -167,7 +176,15 @@ void SQLiteDatabase::deleteOlderRows(SuccessCompletion completion) {
 void SQLiteDatabase::runDashboardStatement(const std::string& sql, WriteCompletion completion) {
   auto statement = prepareStatement(sql.c_str());
   if (!statement) return failOnMain(std::move(completion), statement.error());
-  if (sqlite3_step(statement->get()) == SQLITE_DONE) return succeedOnMain(std::move(completion), true);
+  if (sqlite3_step(statement->get()) == SQLITE_DONE) {
+    if (changesDashboardAlone(sql)) {
+      keptReadings_->dashboardHasChanged();
+    } else {
+      keptReadings_->giveUp();
+    }
+    return succeedOnMain(std::move(completion), true);
+  }
+  keptReadings_->giveUp();
   const SQLiteError error{SQLiteError::Case::Prepare, libraryMessage()};
   statement->reset();
   completion(false, error);

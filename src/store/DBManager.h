@@ -19,8 +19,9 @@ struct sqlite3_stmt;
 namespace quorl {
 
 namespace store_detail {
+class KeptReadings;
 class MainHandOver;
-}
+}  // namespace store_detail
 
 struct FinalizeStatement {
   void operator()(sqlite3_stmt* statement) const;
@@ -36,6 +37,8 @@ std::optional<std::string> databasePath();
 /// Every operation may be called on any thread, returns at once and is one work item of the queue; it prepares, steps
 /// and finalises a statement of its own. There is no statement cache, no batching, no retry, no escaping of what is
 /// spliced into a text, and no pragma but the journal mode; foreign keys stay off, which the first dashboard needs.
+/// The reads of latest values step theirs only where the latest readings, which inserts keep current, cannot answer:
+/// the statements scan the table, and the answers are the same.
 /// A work item holds the database weakly: with the database gone, a write does nothing and does not complete, and a
 /// read ends the process.
 ///
@@ -109,6 +112,7 @@ class SQLiteDatabase : public std::enable_shared_from_this<SQLiteDatabase> {
   void runDashboardStatement(const std::string& sql, WriteCompletion completion);
 
   sqlite3* const dbPointer_;
+  const std::unique_ptr<store_detail::KeptReadings> keptReadings_;  // on `queue` alone
   const std::shared_ptr<Queue> queue_;
   const std::shared_ptr<store_detail::MainHandOver> handOver_;
 };

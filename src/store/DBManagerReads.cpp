@@ -10,15 +10,21 @@
 
 #include "app/HardwareManager.h"
 #include "base/DateText.h"
+#include "store/ConnectionLock.h"
 #include "store/DBManager.h"
 #include "store/EnumeratorPrefix.h"
+#include "store/KeptReadings.h"
 #include "store/MetricStatements.h"
 #include "store/WorkItems.h"
 
 namespace quorl {
 
+using store_detail::ConnectionLock;
 using store_detail::enqueueRead;
 using store_detail::failOnMain;
+using store_detail::KeptReadings;
+using store_detail::LatestReadings;
+using store_detail::StoredReading;
 using store_detail::succeedOnMain;
 
 namespace {
@@ -53,18 +59,6 @@ class RowReader {
  private:
   sqlite3_stmt* const statement_;
   bool hasNull_ = false;
-};
-
-/// Holds the connection's own mutex, which is a recursive one.
-class ConnectionLock {
- public:
-  explicit ConnectionLock(sqlite3* connection) : mutex_(sqlite3_db_mutex(connection)) { sqlite3_mutex_enter(mutex_); }
-  ~ConnectionLock() { sqlite3_mutex_leave(mutex_); }
-  ConnectionLock(const ConnectionLock&) = delete;
-  ConnectionLock& operator=(const ConnectionLock&) = delete;
-
- private:
-  sqlite3_mutex* const mutex_;
 };
 
 /// Localised attribute names of one read: few names, many rows.
@@ -113,20 +107,29 @@ void SQLiteDatabase::fetchAvailableMetrics(std::int32_t subsId, AvailableMetrics
     if (!statement) return failOnMain(std::move(completion), described(statement.error()));
     AvailableMetrics metrics;
     WallClockReader dates;
-    while (sqlite3_step(statement->get()) == SQLITE_ROW) {
-      RowReader row(statement->get());
-      std::string metricTech = row.text(0);
-      MetricList entry;
-      entry.metricName = row.text(1);
-      const std::string_view collectedOn = row.view(2);
-      entry.subsId = row.integer(3);
-      if (row.hasNull()) {
-        statement->reset();
-        return completion({}, emptyQueryResult());
+    const auto add = [&](const StoredReading& row) {
+      const std::optional<Date> date = dates.read(row.collectedOn);
+      auto rows = metrics.find(row.metricTech);
+      if (rows == metrics.end()) rows = metrics.try_emplace(std::string(row.metricTech)).first;
+      rows->second.push_back({std::string(row.metricName), date ? *date : Platform::current().clock.now(), row.subsId});
+    };
+    if (const LatestReadings* const latest = self.keptReadings_->current()) {
+      latest->eachMetric(subsId, add);
+    } else {
+      while (sqlite3_step(statement->get()) == SQLITE_ROW) {
+        RowReader columns(statement->get());
+        StoredReading row;
+        row.metricTech = columns.view(0);
+        row.metricName = columns.view(1);
+        row.collectedOn = columns.view(2);
+        row.subsId = columns.integer(3);
+        if (columns.hasNull()) {
+          statement->reset();
+          return completion({}, emptyQueryResult());
+        }
+        add(row);
       }
-      const std::optional<Date> date = dates.read(collectedOn);
-      entry.collectedOn = date ? *date : Platform::current().clock.now();
-      metrics[std::move(metricTech)].push_back(std::move(entry));
+      self.keptReadings_->statementHasAnswered();
     }
     statement->reset();
     succeedOnMain(std::move(completion), std::move(metrics));
@@ -145,34 +148,57 @@ void SQLiteDatabase::fetchMetricContents(std::string_view metricTech, std::strin
     std::vector<Metric> metrics;
     WallClockReader dates;
     LocalizedNames names;
-    while (sqlite3_step(statement->get()) == SQLITE_ROW) {
-      RowReader row(statement->get());
-      Metric metric;
-      metric.metricTech = row.text(1);
-      metric.metricName = row.text(2);
-      metric.attributeNameNonLocalized = row.text(3);
-      metric.attributeValue = row.text(4);
-      metric.attributeValueType = row.text(5);
-      metric.graphable = row.integer(6) == 1;
-      metric.metricId = row.text(7);
-      metric.subsId = row.integer(8);
-      const std::string_view collectedOn = row.view(9);
-      if (row.hasNull()) return failOnMain(std::move(completion), emptyQueryResult());
-      const std::optional<Date> date = dates.read(collectedOn);
-      if (!date) {
-        statement->reset();
-        return completion({}, emptyQueryResult());
-      }
+    bool isDated = true;
+    const auto add = [&](const StoredReading& row) {
+      const std::optional<Date> date = dates.read(row.collectedOn);
+      isDated = isDated && date;
+      if (!isDated) return;
+      Metric& metric = metrics.emplace_back();
       metric.id = Uuid::make();
+      metric.metricTech = row.metricTech;
+      metric.metricName = row.metricName;
+      metric.attributeNameNonLocalized = row.attributeName;
       metric.attributeName = names.of(metric.attributeNameNonLocalized);
+      metric.attributeValue = row.attributeValue;
       removeEnumeratorPrefix(metric.attributeValue);
+      metric.attributeValueType = row.attributeValueType;
       metric.collectedOn = *date;
-      metrics.push_back(std::move(metric));
+      metric.metricId = row.metricId;
+      metric.subsId = row.subsId;
+      metric.graphable = row.graphable;
+    };
+    std::string message;
+    const bool areTexts = KeptReadings::areTakenAsTexts({metricTech, metricName, attributeName.value_or("")});
+    if (const LatestReadings* const latest = areTexts ? self.keptReadings_->current() : nullptr) {
+      if (!attributeName) {
+        latest->eachReading(metricTech, metricName, subsId, add);
+      } else if (const auto row = latest->reading(metricTech, metricName, *attributeName, subsId)) {
+        add(*row);
+      }
+      message = sqlite3_errstr(SQLITE_DONE);
+    } else {
+      while (isDated && sqlite3_step(statement->get()) == SQLITE_ROW) {
+        RowReader columns(statement->get());
+        StoredReading row;
+        row.metricTech = columns.view(1);
+        row.metricName = columns.view(2);
+        row.attributeName = columns.view(3);
+        row.attributeValue = columns.view(4);
+        row.attributeValueType = columns.view(5);
+        row.graphable = columns.integer(6) == 1;
+        row.metricId = columns.view(7);
+        row.subsId = columns.integer(8);
+        row.collectedOn = columns.view(9);
+        if (columns.hasNull()) return failOnMain(std::move(completion), emptyQueryResult());
+        add(row);
+      }
+      message = self.libraryMessage();
+      self.keptReadings_->statementHasAnswered();
     }
-    // The library's text is never empty, so a read that went well prints this line too.
-    if (const std::string message = self.libraryMessage(); !message.empty())
-      Platform::current().console.print("error occurred while fetching metric contents " + message);
     statement->reset();
+    if (!isDated) return completion({}, emptyQueryResult());
+    // The library's text is never empty, so a read that went well prints this line too.
+    if (!message.empty()) Platform::current().console.print("error occurred while fetching metric contents " + message);
     succeedOnMain(std::move(completion), std::move(metrics));
   });
 }

@@ -139,6 +139,10 @@ std::string SQLTable<Metric>::dashboard(std::int32_t subsId) {
       {"SELECT * FROM Dashboard WHERE subs_id == ", std::to_string(subsId), " GROUP BY attribute_name"});
 }
 
+bool changesDashboardAlone(std::string_view sql) {
+  return sql.starts_with("INSERT OR REPLACE INTO Dashboard (") || sql.starts_with("DELETE from Dashboard WHERE ");
+}
+
 const char* exportStatement(AttributeDetailTimeFrame timeFrame) {
   switch (timeFrame) {
     case AttributeDetailTimeFrame::daily:

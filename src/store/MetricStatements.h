@@ -39,6 +39,9 @@ struct SQLTable<Metric> {
   static std::string dashboard(std::int32_t subsId);
 };
 
+/// Whether a statement begins like those that insert into `Dashboard` or delete from it, and so changes nothing else.
+bool changesDashboardAlone(std::string_view sql);
+
 /// Text of the retention run. Its limit is UTC while the rows hold local time, so it is off by the zone's offset.
 extern const char kDeleteOlderRowsStatement[];
 
