@@ -172,14 +172,93 @@ TEST_F(AllMetricsTest, ANewerReadingOfAKnownMetricReloads) {
   EXPECT_EQ(screen->reloads, 1);
 }
 
-TEST_F(AllMetricsTest, EveryNewerReadingReloadsWithoutThrottling) {
+TEST_F(AllMetricsTest, ReadingsThatComeWhileTheListIsReadShareTheReadThatFollows) {
   launch();
   stored(reading("LTE", "Tx Power", "power", "11"));
   open();
   pass(1s);
-  for (int i = 0; i < 5; ++i) announced(reading("LTE", "Tx Power", "power", "12"));
+  announced(reading("LTE", "Tx Power", "power", "12"));
+  for (int i = 0; i < 4; ++i) {
+    announced(reading("LTE", "Tx Power", "power", "12"));
+    EXPECT_EQ(databaseQueue().waiting(), 1U);
+  }
   settle();
-  EXPECT_EQ(screen->reloads, 5);
+  EXPECT_EQ(screen->reloads, 2);
+  EXPECT_EQ(databaseQueue().waiting(), 0U);
+}
+
+TEST_F(AllMetricsTest, ARowAnnouncedWhileTheListIsReadIsShownByTheReadThatFollows) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  open();
+  announced(reading("LTE", "C-DRX", "rrc_state", "IDLE"));
+  databaseQueue().step();  // the read is done, but its answer has not arrived
+  store->insertMetric(reading("5G", "Nr Rrc State", "state", "2"), [&](bool success, const auto& /*error*/) {
+    EXPECT_TRUE(success);
+    announced(reading("5G", "Nr Rrc State", "state", "2"));
+  });
+  settle();
+  EXPECT_THAT(techs(), ElementsAre("RAT", "5G", "LTE"));
+}
+
+TEST_F(AllMetricsTest, RequestsThatShareAReadLogAsIfEachHadItsOwn) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  open();
+  pass(1s);
+  for (int i = 0; i < 3; ++i) announced(reading("LTE", "Tx Power", "power", "12"));
+  settle();
+  std::vector<std::string> expected;
+  for (int i = 0; i < 3; ++i) {
+    expected.push_back("AllMetricsViewModel - processNewMetric begins  tech LTE name: Tx Power");
+    expected.push_back("AllMetricsViewModel - loadMetricList ");
+  }
+  for (int i = 0; i < 3; ++i) {
+    expected.push_back("AllMetricsViewModel - fetchAvailableMetricsList metricsList.count : 2 ");
+    expected.push_back("AllMetricsViewModel - processNewMetric isSectionNameExists");
+  }
+  EXPECT_EQ(log.texts("allmetrics"), expected);
+}
+
+TEST_F(AllMetricsTest, RequestsThatShareAFailedReadAreAllToldAndLogged) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  open();
+  sql("UPDATE Metric SET metric_tech = NULL");  // reported on the database's queue
+  int failures = 0;
+  for (int i = 0; i < 3; ++i)
+    model->loadMetricList([&](bool success) {
+      if (!success) ++failures;
+    });
+  settle();
+  EXPECT_EQ(failures, 3);
+  EXPECT_EQ(log.count("error occurred  ---> EmptyQueryResult"), 3U);
+  EXPECT_EQ(log.count("AllMetricsViewModel - fetchAvailableMetricsList error: EmptyQueryResult "), 3U);
+  sql("UPDATE Metric SET metric_tech = 'LTE'");
+  EXPECT_EQ(loaded(), true);  // the next one has a read again
+}
+
+TEST_F(AllMetricsTest, AChangeOfSubscriptionWhileTheListIsReadIsReadNext) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11", 1));
+  stored(reading("5G", "Nr Rrc State", "state", "2", 0));
+  open();
+  announced(reading("5G", "Nr Ota Msg", "deployment", "2"));
+  chooses(1);
+  EXPECT_THAT(techs(), ElementsAre("RAT", "LTE"));
+}
+
+TEST_F(AllMetricsTest, ALoadAskedForByACompletionIsReadNext) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  open();
+  std::vector<bool> answers;
+  model->loadMetricList([&](bool first) {
+    answers.push_back(first);
+    model->loadMetricList([&](bool second) { answers.push_back(second); });
+  });
+  settle();
+  EXPECT_THAT(answers, ElementsAre(true, true));
 }
 
 TEST_F(AllMetricsTest, AReadingNoNewerThanItsRowDoesNothing) {

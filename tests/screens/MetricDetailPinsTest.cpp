@@ -66,25 +66,6 @@ TEST_F(MetricDetailPinsTest, AFailedReadOfThePinsStillTellsTheScreen) {
   EXPECT_EQ(screen->refreshes, 1);
 }
 
-TEST_F(MetricDetailPinsTest, OverlappingLoadsMarkOnlyWhenAllReadsHaveEnded) {
-  launch();
-  stored(reading("LTE", "Tx Power", "power", "11"));
-  open("LTE", "Tx Power");
-  model->processNewMetric(reading("LTE", "Tx Power", "power", "12"));
-  ASSERT_EQ(databaseQueue().waiting(), 4U);
-  const auto readOne = [&] {
-    databaseQueue().step();
-    while (platform.mainQueue->step()) {
-    }
-  };
-  readOne();
-  readOne();
-  EXPECT_EQ(screen->refreshes, 0);  // the first load's reads are in, but not the second's
-  readOne();
-  readOne();
-  EXPECT_EQ(screen->refreshes, 2);
-}
-
 // Pinning.
 
 TEST_F(MetricDetailPinsTest, PinningInsertsTheAttributeForTheRowsSubscription) {

@@ -5,6 +5,7 @@ namespace {
 
 using test::line;
 using ::testing::ElementsAre;
+using ::testing::ElementsAreArray;
 using ::testing::IsEmpty;
 using ::testing::Pair;
 using namespace std::chrono_literals;
@@ -175,6 +176,48 @@ TEST_F(MetricDetailTest, ItsMetricOnTheOtherSubscriptionTakesTheScreenOverAsMean
   EXPECT_EQ(model->subsId(), 0);
 }
 
+TEST_F(MetricDetailTest, LoadsAskedForWhileOneIsUnderWayShareTheOneThatFollows) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  open("LTE", "Tx Power");
+  for (int i = 0; i < 5; ++i) {
+    announced(reading("LTE", "Tx Power", "power", "12"));
+    EXPECT_EQ(databaseQueue().waiting(), 2U);  // the reads of one load
+  }
+  settle();
+  EXPECT_EQ(screen->refreshes, 2);
+}
+
+TEST_F(MetricDetailTest, ARowAnnouncedWhileItLoadsIsShownByTheLoadThatFollows) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  open("LTE", "Tx Power");
+  databaseQueue().step();  // its rows are read, but have not arrived
+  store->insertMetric(reading("LTE", "Tx Power", "band", "3"), [&](bool success, const auto& /*error*/) {
+    EXPECT_TRUE(success);
+    announced(reading("LTE", "Tx Power", "band", "3"));
+  });
+  settle();
+  EXPECT_THAT(shown(), ElementsAre(Pair("band", "3"), Pair("power", "11")));
+}
+
+TEST_F(MetricDetailTest, LoadsOfBothSubscriptionsAllFollowAndTheLastAskedForStays) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11", 0));
+  stored(reading("LTE", "Tx Power", "power", "20", 1));
+  open("LTE", "Tx Power");
+  for (const std::int32_t subsId : {0, 1, 0, 1, 0}) announced(reading("LTE", "Tx Power", "power", "12", subsId));
+  std::vector<std::string> seen;
+  const Connection connection = model->onChange([&] {
+    if (model->metrics().empty()) return;
+    const std::string& value = model->metrics().front().attributeValue;
+    if (seen.empty() || seen.back() != value) seen.push_back(value);
+  });
+  settle();
+  EXPECT_THAT(seen, ElementsAre("11", "20", "11"));
+  EXPECT_EQ(screen->refreshes, 3);
+}
+
 TEST_F(MetricDetailTest, ANewLoadDoesNotBringTheSpinnerBack) {
   launch();
   opened("LTE", "Tx Power");
@@ -213,6 +256,17 @@ TEST_F(MetricDetailTest, AFailedReadLeavesTheRowsAndLogs) {
   EXPECT_THAT(log.texts("metricDetail"),
               ElementsAre("metricDetailsViewModel error - processNewMetric: Prepare(message: \"no such table: "
                           "Metric\")"));
+}
+
+TEST_F(MetricDetailTest, AFailedLoadIsLoggedForEachTimeThatItWasAskedFor) {
+  launch();
+  loses("Metric");
+  open("LTE", "Tx Power");
+  for (int i = 0; i < 3; ++i) model->processNewMetric(reading("LTE", "Tx Power", "power", "12"));
+  settle();
+  EXPECT_THAT(log.texts("metricDetail"),
+              ElementsAreArray(std::vector<std::string>(
+                  4, "metricDetailsViewModel error - processNewMetric: Prepare(message: \"no such table: Metric\")")));
 }
 
 TEST_F(MetricDetailTest, ATimeThatCannotBeReadLeavesTheRowsAndLogs) {

@@ -21,8 +21,13 @@ constexpr std::chrono::seconds kRefreshInterval{15};
 /// A dashboard with a single reading counts as empty.
 constexpr std::size_t kFewestReadings = 2;
 
-std::string description(const std::optional<SQLiteError>& error) {
-  return error ? logText(*error) : "nil";
+/// An error for the log, where none reads "nil".
+struct Description {
+  const std::optional<SQLiteError>& error;
+};
+
+std::string logText(const Description& description) {
+  return description.error ? logText(*description.error) : "nil";
 }
 
 DashboardViewModelObject shown(const Metric& row) {
@@ -69,7 +74,7 @@ void DashboardViewModel::startUpDidLoad(const std::optional<std::vector<Metric>>
     startTimer();
     return;
   }
-  dashboardLog.log("DashboardViewModel -  init -  loadDashboardData %{public}s", description(error));
+  dashboardLog.log("DashboardViewModel -  init -  loadDashboardData %{public}s", Description{error});
   if (Platform::current().mainQueue.isCurrent()) {
     seed();
     return;
@@ -92,7 +97,7 @@ void DashboardViewModel::loadInitialDashboard(SeedingCompletion completion) {
   persistanceStore_->loadInitialDashboard(
       [weak = weak_from_this(), completion = std::move(completion)](bool success, std::optional<SQLiteError> error) {
         if (!success) {
-          dashboardLog.log("loadInitialDashboard - failed: %{public}s", description(error));
+          dashboardLog.log("loadInitialDashboard - failed: %{public}s", Description{error});
           return;
         }
         if (const auto self = weak.lock()) self->loadSeededDashboard(completion);
@@ -107,7 +112,7 @@ void DashboardViewModel::loadSeededDashboard(SeedingCompletion completion) {
       dashboardLog.log("DashboardViewModel -  init -  loadInitialDashboard success");
       self->updateDashboardDataSource(*rows);
     } else {
-      dashboardLog.log("DashboardViewModel -  init -  loadInitialDashboard failed: %{public}s", description(error));
+      dashboardLog.log("DashboardViewModel -  init -  loadInitialDashboard failed: %{public}s", Description{error});
     }
     completion(rows.has_value());
   });
@@ -124,7 +129,7 @@ void DashboardViewModel::modifyRefresh() {
   loadDashboardData(
       [weak = weak_from_this()](std::optional<std::vector<Metric>> rows, const std::optional<SQLiteError>& error) {
         if (!rows) {
-          dashboardLog.error("error  ---> %{public}s", description(error));
+          dashboardLog.error("error  ---> %{public}s", Description{error});
           return;
         }
         const auto self = weak.lock();
@@ -139,7 +144,7 @@ void DashboardViewModel::reload() {
   loadDashboardData(
       [weak = weak_from_this()](std::optional<std::vector<Metric>> rows, const std::optional<SQLiteError>& error) {
         if (!rows) {
-          dashboardLog.error("error  ---> %{public}s", description(error));
+          dashboardLog.error("error  ---> %{public}s", Description{error});
           return;
         }
         if (const auto self = weak.lock()) self->updateDashboardDataSource(*rows);

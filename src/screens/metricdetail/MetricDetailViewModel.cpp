@@ -41,7 +41,7 @@ std::shared_ptr<MetricDetailViewModel> MetricDetailViewModel::make(std::shared_p
   std::shared_ptr<MetricDetailViewModel> model(
       new MetricDetailViewModel(std::move(store), std::move(metricTech), std::move(metricName), subsId, collectedOn));
   model->persistanceStore_->setStoreDelegate(model);
-  model->load(model->metricTech_, model->metricName_, model->subsId_);
+  model->requestLoad(model->subsId_);
   return model;
 }
 
@@ -53,25 +53,50 @@ MetricDetailViewModel::MetricDetailViewModel(std::shared_ptr<PersistanceStore> s
       subsId_(subsId),
       collectedOn_(collectedOn) {}
 
-void MetricDetailViewModel::load(const std::string& metricTech, const std::string& metricName, std::int32_t subsId) {
+void MetricDetailViewModel::requestLoad(std::int32_t subsId) {
+  const auto waiting =
+      std::find_if(waitingLoads_.begin(), waitingLoads_.end(), [&](const Load& load) { return load.subsId == subsId; });
+  if (waiting == waitingLoads_.end()) {
+    waitingLoads_.push_back({subsId, 1});
+  } else {
+    ++waiting->requests;
+    std::rotate(waiting, waiting + 1, waitingLoads_.end());  // what was asked for last is shown last
+  }
+  if (loadsUnderWay_ == 0) startWaitingLoads();
+}
+
+void MetricDetailViewModel::startWaitingLoads() {
+  for (const Load& load : std::exchange(waitingLoads_, {})) start(load);
+}
+
+void MetricDetailViewModel::start(const Load& load) {
+  ++loadsUnderWay_;
   scheduleEndOfSpinner();
   group_.enter();
-  persistanceStore_->fetchMetricContents(
-      metricTech, metricName, std::nullopt, subsId,
-      [weak = weak_from_this(), group = group_](std::vector<Metric> rows, std::optional<SQLiteError> error) mutable {
-        if (const auto self = weak.lock()) self->contentsDidLoad(std::move(rows), error);
-        group.leave();
-      });
+  persistanceStore_->fetchMetricContents(metricTech_, metricName_, std::nullopt, load.subsId,
+                                         [weak = weak_from_this(), group = group_, requests = load.requests](
+                                             std::vector<Metric> rows, std::optional<SQLiteError> error) mutable {
+                                           if (const auto self = weak.lock())
+                                             self->contentsDidLoad(std::move(rows), error, requests);
+                                           group.leave();
+                                         });
   group_.enter();
   const auto pinned = std::make_shared<std::vector<DashboardTableItem>>();
-  persistanceStore_->fetchDashboard(subsId, [pinned, group = group_](std::vector<DashboardTableItem> items,
-                                                                     std::optional<SQLiteError> /*error*/) mutable {
-    *pinned = std::move(items);
-    group.leave();
-  });
+  persistanceStore_->fetchDashboard(
+      load.subsId,
+      [pinned, group = group_](std::vector<DashboardTableItem> items, std::optional<SQLiteError> /*error*/) mutable {
+        *pinned = std::move(items);
+        group.leave();
+      });
   group_.notify(Platform::current().mainQueue, [weak = weak_from_this(), pinned] {
-    if (const auto self = weak.lock()) self->markBookmarks(*pinned);
+    if (const auto self = weak.lock()) self->loadDidEnd(*pinned);
   });
+}
+
+void MetricDetailViewModel::loadDidEnd(const std::vector<DashboardTableItem>& pinned) {
+  markBookmarks(pinned);
+  --loadsUnderWay_;
+  if (loadsUnderWay_ == 0) startWaitingLoads();
 }
 
 void MetricDetailViewModel::scheduleEndOfSpinner() {
@@ -87,13 +112,15 @@ void MetricDetailViewModel::endSpinner() {
   changed_();
 }
 
-void MetricDetailViewModel::contentsDidLoad(std::vector<Metric> rows, const std::optional<SQLiteError>& error) {
+void MetricDetailViewModel::contentsDidLoad(std::vector<Metric> rows, const std::optional<SQLiteError>& error,
+                                            std::size_t requests) {
   if (!error) {
     endSpinner();
     apply(std::move(rows));
     return;
   }
-  metricDetailLog.log("metricDetailsViewModel error - processNewMetric: %{public}@", *error);
+  for (; requests > 0; --requests)
+    metricDetailLog.log("metricDetailsViewModel error - processNewMetric: %{public}@", *error);
   // A row that cannot be read is reported on the database's queue.
   Platform::current().mainQueue.async([weak = weak_from_this()] {
     if (const auto self = weak.lock()) self->endSpinner();
@@ -143,7 +170,7 @@ void MetricDetailViewModel::markBookmarks(const std::vector<DashboardTableItem>&
 
 void MetricDetailViewModel::processNewMetric(const Metric& metric) {
   if (metric.metricTech != metricTech_ || metric.metricName != metricName_) return;
-  load(metricTech_, metricName_, metric.subsId);
+  requestLoad(metric.subsId);
 }
 
 const Metric* MetricDetailViewModel::row(std::size_t index, std::size_t sectionIndex, bool isSectioned) const {

@@ -24,6 +24,10 @@ class MetricDetailViewModelDelegate {
 
 /// The latest value of each attribute of one metric. Follows its metric live for as long as it holds the store's
 /// delegate slot. Main thread, except where told otherwise.
+///
+/// While a load is under way, those asked for meanwhile wait and join: one for each subscription follows, in the order
+/// in which each was last asked for, and sees every row that was announced before. So no announced row goes unread, and
+/// the loads do not fall behind the rows. A failed load is logged once for each time that it was asked for.
 class MetricDetailViewModel final : public PersistanceStoreDelegate,
                                     public std::enable_shared_from_this<MetricDetailViewModel> {
  public:
@@ -49,7 +53,8 @@ class MetricDetailViewModel final : public PersistanceStoreDelegate,
   void setDelegate(std::weak_ptr<MetricDetailViewModelDelegate> delegate) { delegate_ = std::move(delegate); }
   [[nodiscard]] Connection onChange(Signal<>::Handler handler) { return changed_.connect(std::move(handler)); }
 
-  /// Reads the metric again, for the subscription of `metric`, if it is the model's own. On the poster's thread.
+  /// Reads the metric again, for the subscription of `metric`, if it is the model's own; now or after the load under
+  /// way. On the poster's thread, which is the main one.
   void processNewMetric(const Metric& metric) override;
 
   /// Row `index`, or the row of a section when `isSectioned`. Null when there is none.
@@ -61,9 +66,18 @@ class MetricDetailViewModel final : public PersistanceStoreDelegate,
   MetricDetailViewModel(std::shared_ptr<PersistanceStore> store, std::string metricTech, std::string metricName,
                         std::int32_t subsId, Date collectedOn);
 
-  void load(const std::string& metricTech, const std::string& metricName, std::int32_t subsId);
+  /// What several requests have in common.
+  struct Load {
+    std::int32_t subsId;
+    std::size_t requests;
+  };
+
+  void requestLoad(std::int32_t subsId);
+  void startWaitingLoads();
+  void start(const Load& load);
+  void loadDidEnd(const std::vector<DashboardTableItem>& pinned);
   void scheduleEndOfSpinner();
-  void contentsDidLoad(std::vector<Metric> rows, const std::optional<SQLiteError>& error);
+  void contentsDidLoad(std::vector<Metric> rows, const std::optional<SQLiteError>& error, std::size_t requests);
   void endSpinner();
   void apply(std::vector<Metric> rows);
   void applyLastSeen();
@@ -76,7 +90,9 @@ class MetricDetailViewModel final : public PersistanceStoreDelegate,
   const std::string metricTech_;
   const std::string metricName_;
   const std::int32_t subsId_;
-  DispatchGroup group_;  // of all loads at once: the bookmarks wait for the sum of those that overlap
+  DispatchGroup group_;  // of all loads under way: the bookmarks wait for the sum of them
+  std::size_t loadsUnderWay_ = 0;
+  std::vector<Load> waitingLoads_;  // one for each subscription
   std::vector<Metric> metrics_;
   std::vector<MetricSectional> metricSectionals_;
   Date collectedOn_;

@@ -45,42 +45,76 @@ void AllMetricsViewModel::start() {
   persistanceStore_->setStoreDelegate(weak_from_this());
   subscriptionObservation_ = NotificationCenter::defaultCenter().observe(
       notification::kSubsIdSelectionChange, [weak = weak_from_this()](const Notification&) {
-        if (const auto self = weak.lock()) self->loadAndReload();
+        if (const auto self = weak.lock()) self->load({Request::Kind::list, {}});
       });
-  loadAndReload();
-}
-
-void AllMetricsViewModel::loadAndReload() {
-  load([weak = weak_from_this()](bool isReplaced, bool /*success*/) {
-    if (!isReplaced) return;
-    if (const auto self = weak.lock()) self->reloadScreen();
-  });
+  load({Request::Kind::list, {}});
 }
 
 void AllMetricsViewModel::loadMetricList(LoadCompletion completion) {
-  load([completion = std::move(completion)](bool /*isReplaced*/, bool success) {
-    if (completion) completion(success);
-  });
+  load({Request::Kind::caller, std::move(completion)});
 }
 
-void AllMetricsViewModel::load(ListCompletion completion) {
+void AllMetricsViewModel::load(Request request) {
   allMetricsLog.log("AllMetricsViewModel - loadMetricList ");
-  persistanceStore_->fetchAvailableMetrics(HardwareManager::shared().currentSubsId(),
-                                           [weak = weak_from_this(), completion = std::move(completion)](
-                                               AvailableMetrics available, std::optional<SQLiteError> error) {
-                                             if (const auto self = weak.lock())
-                                               self->fetchAvailableMetricsList(std::move(available), error, completion);
-                                           });
+  waiting_.push_back(std::move(request));
+  if (!isReading_) read();
+}
+
+void AllMetricsViewModel::read() {
+  isReading_ = true;
+  persistanceStore_->fetchAvailableMetrics(
+      HardwareManager::shared().currentSubsId(), [weak = weak_from_this(), requests = std::exchange(waiting_, {})](
+                                                     AvailableMetrics available, std::optional<SQLiteError> error) {
+        const auto self = weak.lock();
+        if (!self) return;
+        self->fetchAvailableMetricsList(std::move(available), error, requests);
+        if (Platform::current().mainQueue.isCurrent()) return self->readDidEnd();
+        Platform::current().mainQueue.async([weak] {  // a row that cannot be read is reported elsewhere
+          if (const auto alive = weak.lock()) alive->readDidEnd();
+        });
+      });
+}
+
+void AllMetricsViewModel::readDidEnd() {
+  isReading_ = false;
+  if (!waiting_.empty()) read();
 }
 
 void AllMetricsViewModel::fetchAvailableMetricsList(AvailableMetrics available, const std::optional<SQLiteError>& error,
-                                                    const ListCompletion& completion) {
-  if (error) {
-    allMetricsLog.log("error occurred  ---> %{public}s", *error);
-    allMetricsLog.log("AllMetricsViewModel - fetchAvailableMetricsList error: %{public}s ", *error);
-    completion(/*isReplaced=*/false, /*success=*/false);
-    return;
+                                                    const std::vector<Request>& requests) {
+  if (error) return reportFailure(*error, requests);
+  replaceList(std::move(available));
+  const bool success = metricsList_.size() >= 2;
+  bool reloads = false;
+  for (const Request& request : requests) {
+    allMetricsLog.log("AllMetricsViewModel - fetchAvailableMetricsList metricsList.count : %{public}d ",
+                      metricsList_.size());
+    switch (request.kind) {
+      case Request::Kind::list:
+        reloads = true;
+        break;
+      case Request::Kind::newMetric:
+        if (!success) break;
+        allMetricsLog.log("AllMetricsViewModel - processNewMetric isSectionNameExists");
+        reloads = true;
+        break;
+      case Request::Kind::caller:
+        if (request.completion) request.completion(success);
+        break;
+    }
   }
+  if (reloads) reloadScreen();
+}
+
+void AllMetricsViewModel::reportFailure(const SQLiteError& error, const std::vector<Request>& requests) {
+  for (const Request& request : requests) {
+    allMetricsLog.log("error occurred  ---> %{public}s", error);
+    allMetricsLog.log("AllMetricsViewModel - fetchAvailableMetricsList error: %{public}s ", error);
+    if (request.completion) request.completion(false);
+  }
+}
+
+void AllMetricsViewModel::replaceList(AvailableMetrics available) {
   available.erase(kTelephonyTech);  // the fixed rows stand for them
   std::vector<AllMetricsDataSource> groups{telephonyGroup()};
   groups.reserve(available.size() + 1);
@@ -91,21 +125,12 @@ void AllMetricsViewModel::fetchAvailableMetricsList(AvailableMetrics available, 
     groups.push_back(std::move(group));
   }
   metricsList_ = std::move(groups);
-  allMetricsLog.log("AllMetricsViewModel - fetchAvailableMetricsList metricsList.count : %{public}d ",
-                    metricsList_.size());
-  completion(/*isReplaced=*/true, /*success=*/metricsList_.size() >= 2);
 }
 
 void AllMetricsViewModel::processNewMetric(const Metric& metric) {
   allMetricsLog.log("AllMetricsViewModel - processNewMetric begins  tech %{public}s name: %{public}s",
                     metric.metricTech, metric.metricName);
-  if (!isNewerThanItsRow(metric)) return;
-  loadMetricList([weak = weak_from_this()](bool success) {
-    const auto self = weak.lock();
-    if (!success || !self) return;
-    allMetricsLog.log("AllMetricsViewModel - processNewMetric isSectionNameExists");
-    self->reloadScreen();
-  });
+  if (isNewerThanItsRow(metric)) load({Request::Kind::newMetric, {}});
 }
 
 bool AllMetricsViewModel::isSectionNameExists(std::string_view metricTech) const {
