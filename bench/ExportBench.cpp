@@ -69,7 +69,8 @@ int main(int argc, char** argv) {
   using namespace quorl;
   if (!bench::initialize(argc, argv)) return 1;
   bench::Phone phone;
-  const auto path = bench::monthOfRows(bench::directories({"."}).front(), bench::rowCount(kUsualRows), phone);
+  const auto path =
+      bench::monthOfRows(bench::directories({"."}).front(), bench::rowCount(kUsualRows), phone.fake.time.now());
   const std::shared_ptr<SQLiteDatabase> database = SQLiteDatabase::open(path.string()).value();
   bench::add("read/store", kRepetitions, [&](benchmark::State& state) {
     for ([[maybe_unused]] auto _ : state) read(*database, phone, [](const ExportedMetrics&) {});

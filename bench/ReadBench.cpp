@@ -92,7 +92,8 @@ int main(int argc, char** argv) {
   using Table = SQLTable<Metric>;
   if (!bench::initialize(argc, argv)) return 1;
   bench::Phone phone;
-  const auto path = bench::monthOfRows(bench::directories({"."}).front(), bench::rowCount(kUsualRows), phone);
+  const auto path =
+      bench::monthOfRows(bench::directories({"."}).front(), bench::rowCount(kUsualRows), phone.fake.time.now());
   const std::shared_ptr<SQLiteDatabase> database = SQLiteDatabase::open(path.string()).value();
   ReadBench reads(phone, database);
 

@@ -103,9 +103,13 @@ std::vector<std::string> directories(std::vector<std::string> otherwise) {
   return otherwise;
 }
 
-std::size_t rowCount(std::size_t usual) {
-  const char* text = std::getenv("QUORL_BENCH_ROWS");
+std::size_t number(const char* name, std::size_t usual) {
+  const char* text = std::getenv(name);
   return text != nullptr ? std::strtoull(text, nullptr, 10) : usual;
+}
+
+std::size_t rowCount(std::size_t usual) {
+  return number("QUORL_BENCH_ROWS", usual);
 }
 
 std::string metricTechOf(std::size_t metric) {
@@ -121,12 +125,12 @@ std::string attributeNameOf(std::size_t attribute) {
   return attribute == 0 ? "timestamp" : fmt::format("some_attribute_name_{}", attribute);
 }
 
-std::filesystem::path monthOfRows(const std::filesystem::path& directory, std::size_t rows, const Phone& phone) {
+std::filesystem::path monthOfRows(const std::filesystem::path& directory, std::size_t rows, Date now) {
   const std::filesystem::path path = directory / fmt::format("quorl-bench-month-{}.sqlite", rows);
   if (std::filesystem::exists(path)) return path;
   const Directory scratch(directory);  // a run that is cut short leaves no half of a file
   const std::filesystem::path unfinished = scratch.path() / "file.sqlite";
-  fill(unfinished, rows, phone.fake.time.now());
+  fill(unfinished, rows, now);
   std::filesystem::rename(unfinished, path);
   return path;
 }

@@ -58,6 +58,8 @@ class Directory {
 /// Where files go: QUORL_BENCH_DIR, or `otherwise`.
 std::vector<std::string> directories(std::vector<std::string> otherwise);
 
+/// The number in the environment variable `name`, or `usual`.
+std::size_t number(const char* name, std::size_t usual);
 /// QUORL_BENCH_ROWS, or `usual`.
 std::size_t rowCount(std::size_t usual);
 
@@ -70,9 +72,9 @@ std::string metricTechOf(std::size_t metric);
 std::string metricNameOf(std::size_t metric);
 std::string attributeNameOf(std::size_t attribute);
 
-/// The file of `rows` such rows over the thirty days up to the phone's now, and of the default pins, in `directory`. It
+/// The file of `rows` such rows over the thirty days up to `now`, and of the default pins, in `directory`. It
 /// is made when it is not there, and stays for later runs.
-std::filesystem::path monthOfRows(const std::filesystem::path& directory, std::size_t rows, const Phone& phone);
+std::filesystem::path monthOfRows(const std::filesystem::path& directory, std::size_t rows, Date now);
 
 /// Memory of the process in bytes by its name in the system's status: "VmRSS:" now, "VmHWM:" the most since the reset.
 std::size_t memory(std::string_view field);

@@ -4,7 +4,7 @@ set -euo pipefail
 bin=$1
 scratch=$(mktemp -d)
 trap 'rm -rf "$scratch"' EXIT
-export QUORL_BENCH_DIR=$scratch QUORL_BENCH_ROWS=2000
+export QUORL_BENCH_DIR=$scratch QUORL_BENCH_ROWS=2000 QUORL_BENCH_SECONDS=1 QUORL_BENCH_STEPS=300
 for bench in "$bin"/bench_*; do
   [ -x "$bench" ] || continue
   "$bench" --benchmark_min_time=0.001 >/dev/null 2>&1 || { echo "$(basename "$bench") failed" >&2; exit 1; }
