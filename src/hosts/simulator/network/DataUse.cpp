@@ -115,7 +115,7 @@ void DataUse::measured() {
   connection_.touch();
   move(core_.now() - movedMs_);
   movedMs_ = core_.now();
-  if (state.serving->downlinkKbps >= 64) starvingSinceMs_ = core_.now();
+  if (state.serving->downlinkKbps >= 32) starvingSinceMs_ = core_.now();
   if (core_.now() - starvingSinceMs_ >= kStarvingMs) stall(core_.random.between(3.0, 20.0), core_.random.chance(0.2));
 }
 

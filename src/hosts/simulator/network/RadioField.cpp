@@ -11,7 +11,7 @@ namespace {
 constexpr double kAntennaGain = 14.0;             // dBi, TR 36.814 table A.2.1.1-2
 constexpr double kLeastCouplingLoss = 70.0;       // however near: TR 36.942 table 4.8
 constexpr double kBeamGain = 6.0;                 // of an NR cell with several beams, over the sector
-constexpr double kWeakest = -140.0;               // what is below disturbs nobody
+constexpr double kWeakest = -136.0;               // what is below disturbs nobody
 constexpr double kHalf = 0.70710678118654752440;  // root of 1/2: half of the variance
 
 /// Losses of walls rise with frequency as those of concrete, 5 + 4 f dB (TR 38.901 table 7.4.3-1); 1 at 2 GHz.
@@ -127,6 +127,8 @@ void RadioField::fillMast(Field& field, const Mast& mast, const Surroundings& pl
   for (const Carrier& carrier : mast.carriers) {
     const double loss = sight * carrier.loss.inSight(ground, logDistance) +
                         (1.0 - sight) * carrier.loss.outOfSight(ground, logDistance) + wall * carrier.wallFactor;
+    const double ahead = network_.sector(carrier.begin).elementPower / 100.0 + kAntennaGain - loss + shadow;
+    if (ahead < kWeakest) continue;
     for (std::uint16_t index = carrier.begin; index < carrier.end; ++index) {
       const Network::Sector& sector = network_.sector(index);
       double degrees = 0;
@@ -137,8 +139,7 @@ void RadioField::fillMast(Field& field, const Mast& mast, const Surroundings& pl
       }
       Received received;
       received.cell = index;
-      received.power = sector.elementPower / 100.0 + kAntennaGain - (sector.hasDirection ? sectorLoss(degrees) : 3.0) -
-                       loss + shadow;
+      received.power = ahead - (sector.hasDirection ? sectorLoss(degrees) : 3.0);
       if (received.power < kWeakest) continue;
       received.power += variation * variations_.normal();
       const std::uint8_t beams = network_.cell(index).beams;

@@ -27,7 +27,7 @@ class RadioField {
 
   RadioField(const Scenario& scenario, const Network& network, std::uint64_t seed);
 
-  /// All cells of an operator above about -140 dBm, in the order of the network. Time and way must not run back. Asked
+  /// All cells of an operator above about -136 dBm, in the order of the network. Time and way must not run back. Asked
   /// twice at a time it gives the same.
   const std::vector<Received>& receive(std::uint8_t operatorIndex, const Surroundings& place, SimulatedMs nowMs);
 

@@ -18,8 +18,8 @@ constexpr double kNoiseGsm = -120.99 + kNoiseFigure;
 constexpr double kOwnDistortion = 0.00063;
 
 constexpr double kWeakestFound = -127.0;
-/// Cells of a technology whose signals a search tells apart in one round.
-constexpr std::size_t kMostLookedAt = 14;
+/// Cells of one frequency that a search tells apart in one round.
+constexpr std::size_t kMostLookedAt = 6;
 
 struct Range {
   double low;
@@ -104,6 +104,10 @@ bool isFindable(const CellMeasurement& measurement) {
   return false;
 }
 
+bool isStronger(const CellMeasurement& left, const CellMeasurement& right) {
+  return left.power != right.power ? left.power > right.power : left.cell->index < right.cell->index;
+}
+
 }  // namespace
 
 Receiver::Receiver(const Network& network, RadioField& field, std::uint64_t seed, std::uint8_t subscription)
@@ -112,7 +116,8 @@ Receiver::Receiver(const Network& network, RadioField& field, std::uint64_t seed
       antennas_(seed, 10U + subscription),
       heard_(network.cells().size()),
       channelPower_(network.channels()),
-      channelDisturb_(network.channels()) {
+      channelDisturb_(network.channels()),
+      heardOn_(network.channels()) {
   for (const Cell& cell : network.cells()) noise_.push_back(fromDecibels(noiseOf(cell)));
 }
 
@@ -122,7 +127,7 @@ void Receiver::listen(const std::vector<std::uint8_t>& operators, const Surround
   load_ = load;
   std::fill(channelPower_.begin(), channelPower_.end(), 0.0);
   std::fill(channelDisturb_.begin(), channelDisturb_.end(), 0.0);
-  for (auto& list : strongest_) list.clear();
+  for (auto& list : heardOn_) list.clear();
   // Filter coefficient 4 of TS 36.331 for a connection; rounds in idle are six times as far apart.
   const double share = isConnected ? 0.5 : 0.8;
   for (const std::uint8_t number : operators)
@@ -142,13 +147,12 @@ void Receiver::hear(const RadioField::Received& received, double share) {
   const std::uint16_t channel = network_.sector(received.cell).channelIndex;
   channelPower_[channel] += heard.linear * occupancy(cell.technology, load_);
   channelDisturb_[channel] += heard.linear * (0.1 + 0.9 * load_);
-  if (heard.power > kWeakestFound) strongest_[static_cast<std::size_t>(cell.technology)].push_back(received.cell);
+  if (heard.power > kWeakestFound) heardOn_[channel].push_back(received.cell);
 }
 
 void Receiver::find() {
-  for (std::size_t technology = 0; technology < found_.size(); ++technology) {
-    found_[technology].clear();
-    std::vector<std::uint16_t>& cells = strongest_[technology];
+  for (auto& list : found_) list.clear();
+  for (std::vector<std::uint16_t>& cells : heardOn_) {
     const auto last = cells.begin() + static_cast<std::ptrdiff_t>(std::min(cells.size(), kMostLookedAt));
     std::partial_sort(cells.begin(), last, cells.end(), [this](std::uint16_t left, std::uint16_t right) {
       const double one = heard_[left].power;
@@ -157,9 +161,11 @@ void Receiver::find() {
     });
     for (auto cell = cells.begin(); cell != last; ++cell) {
       const CellMeasurement measurement = measure(network_.cell(*cell));
-      if (isFindable(measurement)) found_[technology].push_back(measurement);
+      if (isFindable(measurement))
+        found_[static_cast<std::size_t>(measurement.cell->technology)].push_back(measurement);
     }
   }
+  for (auto& list : found_) std::sort(list.begin(), list.end(), isStronger);
 }
 
 const std::vector<CellMeasurement>& Receiver::found(Technology technology) const {

@@ -49,7 +49,7 @@ class Receiver {
   std::vector<double> channelDisturb_;  // by channel: sum of what disturbs others, mW
   std::array<std::vector<CellMeasurement>, 5> found_;
   std::array<double, 4> antennaState_{};
-  std::array<std::vector<std::uint16_t>, 5> strongest_;  // by technology, while they are looked through
+  std::vector<std::vector<std::uint16_t>> heardOn_;  // by channel, while cells are looked for
   SimulatedMs nowMs_ = 0;
   double load_ = 0;
 };

@@ -5,16 +5,21 @@
 namespace quorl::simulator::network {
 namespace {
 
-constexpr std::size_t kMostNeighbours = 8;
-constexpr std::size_t kMostOthers = 6;  // of each technology
+constexpr std::size_t kMostOwn = 6;  // on the serving cell's own frequency: handovers are among them
+constexpr std::size_t kMostOthers = 6;
 
-void take(std::vector<CellMeasurement>& list, const std::vector<CellMeasurement>& found, const Cell* serving,
-          std::size_t most) {
+/// Strongest first, without the serving cell. The own frequency has places of its own, since others may drown it.
+void take(std::vector<CellMeasurement>& list, const std::vector<CellMeasurement>& found, const Cell* serving) {
+  std::size_t own = kMostOwn;
+  std::size_t others = kMostOthers;
   for (const CellMeasurement& measurement : found) {
-    if (most == 0) return;
     if (measurement.cell == serving) continue;
+    const bool isOwn = serving != nullptr && measurement.cell->technology == serving->technology &&
+                       measurement.cell->downlinkChannel == serving->downlinkChannel;
+    std::size_t& places = isOwn ? own : others;
+    if (places == 0) continue;
+    --places;
     list.push_back(measurement);
-    --most;
   }
 }
 
@@ -34,8 +39,7 @@ void SubscriptionCore::measure() {
   const Cell* serving = cell();
   for (const Technology technology : {Technology::Nr, Technology::Lte, Technology::Umts, Technology::Gsm}) {
     const bool isOwn = technology == state.technology;
-    take(isOwn ? state.neighbours : state.otherNeighbours, receiver.found(technology), serving,
-         isOwn ? kMostNeighbours : kMostOthers);
+    take(isOwn ? state.neighbours : state.otherNeighbours, receiver.found(technology), serving);
   }
   if (serving != nullptr) state.serving = receiver.serve(*serving);
 }
