@@ -7,7 +7,8 @@ configure fuzz -DQUORL_UI=OFF
 build fuzz
 bin=build/fuzz/bin
 "$bin/fuzz_make_seeds" build/fuzz/seeds resources/recordings/*.jsonl
-[ $# -gt 0 ] || set -- MessageReader ProcessMetric RecordingLines HexadecimalInput JsonInput
+mkdir -p build/fuzz/seeds/Scenario && cp resources/scenarios/*.scenario build/fuzz/seeds/Scenario
+[ $# -gt 0 ] || set -- MessageReader ProcessMetric RecordingLines HexadecimalInput JsonInput Scenario
 for target in "$@"; do
   mkdir -p "build/fuzz/found/$target" "fuzz/corpus/$target"
   echo "$target:"
