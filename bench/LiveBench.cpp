@@ -235,7 +235,9 @@ class Part {
       const auto due = begun_ + std::chrono::seconds(1) * delivered_ / kMetricsPerSecond;
       site_.loop->asyncAfter(std::max<Steady::duration>(due - Steady::now(), 0s), [this] { deliver(); });
     } else {
-      site_.loop->asyncAfter(kLongestWait, [this] { site_.loop->stop(); });
+      site_.loop->asyncAfter(kLongestWait, [this, part = std::weak_ptr(life_)] {
+        if (!part.expired()) site_.loop->stop();
+      });
     }
   }
 
@@ -245,6 +247,7 @@ class Part {
   const std::vector<Source>& metrics_;
   const std::size_t count_;
   const Shown shown_;
+  const std::shared_ptr<const bool> life_ = std::make_shared<const bool>(true);
   Steady::time_point begun_;
   std::size_t delivered_ = 0;
   std::vector<Pending> pending_;
