@@ -37,14 +37,19 @@ Item {
             Accessible.ignored: true
         }
         Item {
+            id: below
+
+            // Side by side where there is room, else one under the other.
+            readonly property bool isNarrow: subtitle.implicitWidth + value.implicitWidth + 2 * Theme.grid > width
+
             width: parent.width
-            height: Math.max(subtitle.height, value.height)
+            height: isNarrow ? subtitle.height + value.height : Math.max(subtitle.height, value.height)
 
             Text {
                 id: subtitle
 
                 objectName: "subtitleLabel"
-                width: parent.width - value.width - Theme.grid * 2
+                width: below.isNarrow ? parent.width : parent.width - value.width - 2 * Theme.grid
                 text: cell.subtitleText
                 textFormat: Text.PlainText
                 elide: Text.ElideRight
@@ -57,7 +62,8 @@ Item {
 
                 objectName: "valueLabel"
                 anchors.right: parent.right
-                width: Math.min(implicitWidth, parent.width * 0.6)
+                y: below.isNarrow ? subtitle.height : 0
+                width: Math.min(implicitWidth, parent.width)
                 text: cell.valueText
                 textFormat: Text.PlainText
                 elide: Text.ElideRight
