@@ -19,6 +19,12 @@ constexpr Logger sondrelLog{log_category::kSondrel};
 constexpr std::chrono::milliseconds kActionDelay{300};
 constexpr double kChunkFileStep = 32;
 constexpr double kMaxLogsStep = 1;
+constexpr double kBlinkOpacity = 0.1;
+constexpr int kBlinkCount = 2;
+
+double easedAtBothEnds(double part) {
+  return part < 0.5 ? 2 * part * part : 1 - 2 * (1 - part) * (1 - part);
+}
 
 }  // namespace
 
@@ -37,8 +43,14 @@ std::shared_ptr<SondrelViewController> SondrelViewController::make() {
 }
 
 void SondrelViewController::viewDidLoad() {
+  if (sondrelService_) return;
   sondrelService_ = SondrelService::make();
   sondrelService_->setDelegate(weak_from_this());
+}
+
+double SondrelViewController::opacityOfBlink(double part) {
+  const double way = std::fmod(part * kBlinkCount, 1) * 2;  // 0 to 1 down, 1 to 2 back
+  return 1 - (1 - kBlinkOpacity) * easedAtBothEnds(way < 1 ? way : 2 - way);
 }
 
 void SondrelViewController::didTapStart() {
@@ -167,8 +179,7 @@ void SondrelViewController::didSelectChoice(const std::string& name) {
   changed_();
 }
 
-FavoritesTableCellV2 SondrelViewController::rowAt(std::size_t index) const {
-  const SondrelFileInformation& file = sondrelData_.value().at(index);
+FavoritesTableCellV2 SondrelViewController::row(const SondrelFileInformation& file) {
   return {"File name: " + file.fileName, "File Size: " + file.fileSize,
           styledText(file.timestamp, DateTextStyle::Medium, DateTextStyle::Medium),
           /*isActivityIndicatorHidden=*/true};

@@ -29,16 +29,17 @@ class SondrelViewController final : public SondrelServiceProtocol,
   using PresentModal = Signal<std::shared_ptr<MultiChoiceSelectionModal>>;
 
   static constexpr char kLoadingText[] = "Choose log config or press start";
-  // A pressed button blinks: its opacity goes down and back, eased at both ends.
-  static constexpr double kBlinkOpacity = 0.1;
-  static constexpr double kBlinkDurationS = 0.2;  // one way
-  static constexpr int kBlinkCount = 2;
+  static constexpr double kBlinkDurationS = 0.8;
+
+  /// Opacity of a pressed button when `part`, 0 to 1, of the blink has passed: twice down to 0.1 and back, each way in
+  /// 0.2 seconds, eased at both ends.
+  static double opacityOfBlink(double part);
 
   static std::shared_ptr<SondrelViewController> make();
   SondrelViewController(const SondrelViewController&) = delete;
   SondrelViewController& operator=(const SondrelViewController&) = delete;
 
-  /// To be called once, when the screen is first shown: makes the capture service.
+  /// The first display: makes the capture service. Further calls do nothing.
   void viewDidLoad();
 
   /// Empties the list at once; the capture starts 0.3 seconds later, with the limits as they are then.
@@ -85,7 +86,9 @@ class SondrelViewController final : public SondrelServiceProtocol,
 
   std::size_t numberOfRows() const { return sondrelData_ ? sondrelData_->size() : 0; }
   /// `index` must be less than `numberOfRows`.
-  FavoritesTableCellV2 rowAt(std::size_t index) const;
+  FavoritesTableCellV2 rowAt(std::size_t index) const { return row(sondrelData_.value().at(index)); }
+  /// How a file is shown.
+  static FavoritesTableCellV2 row(const SondrelFileInformation& file);
 
   /// `handler` reads the rows anew.
   [[nodiscard]] Connection onReload(Signal<>::Handler handler) { return reload_.connect(std::move(handler)); }

@@ -66,6 +66,11 @@ const std::shared_ptr<AllMetricsViewController>& BaseViewController::firstLevelV
   return firstLevelViewController_;
 }
 
+const std::shared_ptr<SondrelViewController>& BaseViewController::sondrelViewController() {
+  if (!sondrelViewController_) sondrelViewController_ = SondrelViewController::make();
+  return sondrelViewController_;
+}
+
 void BaseViewController::menuBarDidSelectItemAt(std::size_t index) {
   if (index >= static_cast<std::size_t>(menuBar()->numberOfSegments())) return;
   const auto chosen = static_cast<BaseViewNavigationIndexes>(index);
@@ -86,6 +91,7 @@ void BaseViewController::embed(BaseViewNavigationIndexes index) {
       firstLevelViewController()->viewWillAppear();
       return;
     case BaseViewNavigationIndexes::third:
+      sondrelViewController()->viewDidLoad();
       return;
   }
 }

@@ -7,6 +7,7 @@
 
 #include "base/NotificationCenter.h"
 #include "base/Signal.h"
+#include "capture/SondrelViewController.h"
 #include "screens/dashboard/DashboardViewController.h"
 #include "screens/export/ExportViewController.h"
 #include "screens/metriclist/AllMetricsViewController.h"
@@ -52,6 +53,7 @@ class BaseViewController final : public MenuBarDelegate, public std::enable_shar
   const std::shared_ptr<MenuBar>& menuBar();
   const std::shared_ptr<DashboardViewController>& dashboardViewController();
   const std::shared_ptr<AllMetricsViewController>& firstLevelViewController();
+  const std::shared_ptr<SondrelViewController>& sondrelViewController();
 
   /// Text of the navigation bar, "" before the first display.
   const std::string& title() const { return title_; }
@@ -82,6 +84,7 @@ class BaseViewController final : public MenuBarDelegate, public std::enable_shar
   BaseViewNavigationIndexes currentlySelectedIndex_ = BaseViewNavigationIndexes::first;
   std::shared_ptr<AllMetricsViewController> firstLevelViewController_;
   std::shared_ptr<DashboardViewController> dashboardViewController_;
+  std::shared_ptr<SondrelViewController> sondrelViewController_;
   std::unique_ptr<CarrierNameSegmentView> carrierBar_;
   std::string title_;
   bool prefersLargeTitles_ = false;

@@ -134,33 +134,33 @@ class SondrelSimulator::Capture {
 /// The main thread's end of a capture.
 class SondrelSimulator::Library final : public Sondrel {
  public:
-  Library(const SondrelSimulator& simulator)
-      : worker_(*simulator.worker_),
-        capture_(std::make_shared<Capture>(simulator.options_, simulator.mainQueue_, worker_, simulator.clock_,
+  explicit Library(const SondrelSimulator& simulator)
+      : worker_(simulator.worker_),
+        capture_(std::make_shared<Capture>(simulator.options_, simulator.mainQueue_, *worker_, simulator.clock_,
                                            listener_)) {}
   // The capture ends on the thread of its timer.
   ~Library() override {
-    worker_.async([capture = std::move(capture_)]() mutable { capture.reset(); });
+    worker_->async([capture = std::move(capture_)]() mutable { capture.reset(); });
   }
   Library(const Library&) = delete;
   Library& operator=(const Library&) = delete;
 
   void setDelegate(std::weak_ptr<SondrelDelegate> delegate) override { listener_->delegate = std::move(delegate); }
   void start(const SondrelConfiguration& configuration) override {
-    worker_.async([capture = capture_, configuration] { capture->start(configuration); });
+    worker_->async([capture = capture_, configuration] { capture->start(configuration); });
   }
   void stop() override {
-    worker_.async([capture = capture_] { capture->stop(); });
+    worker_->async([capture = capture_] { capture->stop(); });
   }
   void reset() override {
-    worker_.async([capture = capture_] { capture->reset(); });
+    worker_->async([capture = capture_] { capture->reset(); });
   }
   void getConfigurationList() override {
-    worker_.async([capture = capture_] { capture->getConfigurationList(); });
+    worker_->async([capture = capture_] { capture->getConfigurationList(); });
   }
 
  private:
-  Queue& worker_;
+  const std::shared_ptr<Queue> worker_;
   const std::shared_ptr<Listener> listener_ = std::make_shared<Listener>();
   std::shared_ptr<Capture> capture_;
 };

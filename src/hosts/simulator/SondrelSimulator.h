@@ -41,7 +41,7 @@ class SondrelSimulator final : public SondrelFactory {
 
   static std::vector<std::string> defaultConfigurations();
 
-  /// The queues and the clock must outlive it, and it must outlive what it makes.
+  /// The main queue and the clock must outlive it and what it makes.
   SondrelSimulator(Options options, Queue& mainQueue, QueueFactory& queues, const Clock& clock);
   ~SondrelSimulator() override;
 

@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "capture/view/SondrelBinding.h"
 #include "shell/BaseViewController.h"
 #include "shell/LargeTitle.h"
 #include "shell/Window.h"
@@ -65,7 +66,8 @@ QObject* ShellBinding::screen(int index) {
   return screen;
 }
 
-QObject* ShellBinding::makeScreen(int /*index*/) {
+QObject* ShellBinding::makeScreen(int index) {
+  if (index == BaseViewController::sondrelIndex) return new SondrelBinding(base_.sondrelViewController(), this);
   return nullptr;
 }
 

@@ -1,0 +1,14 @@
+import QtQuick
+import Quorl
+
+Text {
+    horizontalAlignment: Text.AlignRight
+    textFormat: Text.StyledText
+    elide: Text.ElideRight
+    fontSizeMode: Text.HorizontalFit
+    minimumPixelSize: Theme.caption
+    font.pixelSize: Theme.section
+    font.bold: true
+    color: Theme.title
+    Accessible.role: Accessible.StaticText
+}
