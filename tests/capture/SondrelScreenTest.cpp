@@ -100,6 +100,12 @@ TEST_F(SondrelScreenTest, FirstShowsItsStartValues) {
   EXPECT_EQ(screen->loadingView().loadingLabelText(), "Choose log config or press start");
 }
 
+TEST_F(SondrelScreenTest, ItsServiceIsMadeOnce) {
+  screen->viewDidLoad();
+  screen->viewDidLoad();
+  EXPECT_THAT(library.calls, ElementsAre("construct", "setDelegate"));
+}
+
 TEST_F(SondrelScreenTest, TheTransitionOfTheChoiceHasTheColourOfTheScreen) {
   EXPECT_EQ(screen->transition().circleColor(), "Background");
 }
@@ -213,6 +219,19 @@ TEST_F(SondrelScreenTest, StartWhileRunningStartsAgain) {
   screen->didTapStart();
   passes(1s);
   EXPECT_THAT(library.calls, ElementsAre("start", "start"));
+}
+
+TEST_F(SondrelScreenTest, ABlinkGoesTwiceDownToATenthAndBack) {
+  EXPECT_EQ(SondrelViewController::kBlinkDurationS, 0.8);
+  EXPECT_DOUBLE_EQ(SondrelViewController::opacityOfBlink(0), 1);
+  EXPECT_DOUBLE_EQ(SondrelViewController::opacityOfBlink(0.125), 0.55);
+  EXPECT_DOUBLE_EQ(SondrelViewController::opacityOfBlink(0.25), 0.1);
+  EXPECT_DOUBLE_EQ(SondrelViewController::opacityOfBlink(0.375), 0.55);
+  EXPECT_DOUBLE_EQ(SondrelViewController::opacityOfBlink(0.5), 1);
+  EXPECT_DOUBLE_EQ(SondrelViewController::opacityOfBlink(0.75), 0.1);
+  EXPECT_DOUBLE_EQ(SondrelViewController::opacityOfBlink(1), 1);
+  EXPECT_GT(SondrelViewController::opacityOfBlink(0.01), 0.99) << "eased at its beginning";
+  EXPECT_LT(SondrelViewController::opacityOfBlink(0.24), 0.11) << "and at its end";
 }
 
 TEST_F(SondrelScreenTest, StopBlinksAndStopsTheLibraryAndLeavesTheList) {

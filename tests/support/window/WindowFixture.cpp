@@ -70,6 +70,7 @@ class SteppedAnimations final : public QAnimationDriver {
   ~SteppedAnimations() override { uninstall(); }
 
   void advanceBy(std::chrono::milliseconds duration) {
+    if (!isRunning()) return;  // an advance would start it, and count from then on
     elapsed_ += duration.count();
     advanceAnimation();
   }
