@@ -41,6 +41,7 @@ using Milliseconds = std::chrono::duration<double, std::milli>;
 using namespace std::chrono_literals;
 
 constexpr std::size_t kMetricsPerSecond = 20;
+constexpr Steady::duration kInterval = Steady::duration(1s) / kMetricsPerSecond;
 constexpr std::size_t kFieldsOfMetric = 8;
 constexpr Date kStart{1767605412s};  // 2026-01-05 09:30:12 UTC, when the month of rows ends
 
@@ -232,10 +233,12 @@ class Part {
     if (shown_(source)) pending_.push_back({&source, std::chrono::floor<std::chrono::seconds>(now), Steady::now()});
     site_.fake.zelkor.deliver(zelkor::kEventMetric, event);
     if (++delivered_ < count_) {
-      const auto due = begun_ + std::chrono::seconds(1) * delivered_ / kMetricsPerSecond;
+      const auto due = begun_ + kInterval * static_cast<std::int64_t>(delivered_);
       site_.loop->asyncAfter(std::max<Steady::duration>(due - Steady::now(), 0s), [this] { deliver(); });
     } else {
-      site_.loop->asyncAfter(kLongestWait, [this] { site_.loop->stop(); });
+      site_.loop->asyncAfter(kLongestWait, [this, part = std::weak_ptr(life_)] {
+        if (!part.expired()) site_.loop->stop();
+      });
     }
   }
 
@@ -245,6 +248,7 @@ class Part {
   const std::vector<Source>& metrics_;
   const std::size_t count_;
   const Shown shown_;
+  const std::shared_ptr<const bool> life_ = std::make_shared<const bool>(true);
   Steady::time_point begun_;
   std::size_t delivered_ = 0;
   std::vector<Pending> pending_;
