@@ -50,6 +50,21 @@ TEST(ToolUsage, HelpIsAResult) {
   }
 }
 
+TEST(ToolUsage, TheManualNamesEverySubcommand) {
+  const std::string manual = readFile(sourcePath("packaging/man/quorl-tool.1"));
+  std::istringstream help(runTool({"--help"}).output);
+  std::string line;
+  while (std::getline(help, line) && line != "Subcommands:") continue;
+  int commands = 0;
+  while (std::getline(help, line) && !line.empty()) {
+    std::string name;
+    std::istringstream(line) >> name;
+    EXPECT_NE(manual.find("\n.B " + name + "\n"), std::string::npos) << name;
+    ++commands;
+  }
+  EXPECT_GT(commands, 10);
+}
+
 TEST(ToolUsage, UnknownClassComesWithTheNearestNames) {
   for (const char* command : {"decode", "encode", "schema"}) {
     const ToolResult result = runTool({command, "--class", "KCellularEmContext"});

@@ -1,0 +1,70 @@
+# What `cmake --install` puts where, and the Debian package that `cpack` makes of it.
+include(GNUInstallDirs)
+
+set(programs quorl-tool)
+if(TARGET quorl-simulator)
+  list(APPEND programs quorl-simulator)
+endif()
+install(TARGETS ${programs} RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+
+# The programs look for their resources beside them, in ../share/quorl.
+set(quorl_data ${CMAKE_INSTALL_DATADIR}/quorl)
+file(GLOB device_configurations CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/resources/*.deviceconfig)
+install(FILES ${device_configurations} DESTINATION ${quorl_data})
+install(DIRECTORY ${PROJECT_SOURCE_DIR}/resources/recordings ${PROJECT_SOURCE_DIR}/resources/telephony
+        DESTINATION ${quorl_data})
+if(IS_DIRECTORY ${PROJECT_SOURCE_DIR}/resources/scenarios)
+  install(DIRECTORY ${PROJECT_SOURCE_DIR}/resources/scenarios DESTINATION ${quorl_data})
+endif()
+install(DIRECTORY ${CMAKE_BINARY_DIR}/share/quorl/locale DESTINATION ${quorl_data})
+
+foreach(program IN LISTS programs)
+  set(manual ${PROJECT_SOURCE_DIR}/packaging/man/${program}.1)
+  set(packed ${CMAKE_BINARY_DIR}/packaging/${program}.1.gz)
+  add_custom_command(
+    OUTPUT ${packed}
+    COMMAND ${CMAKE_COMMAND} -E make_directory ${CMAKE_BINARY_DIR}/packaging
+    COMMAND gzip -9nc ${manual} > ${packed}
+    DEPENDS ${manual} VERBATIM)
+  list(APPEND packed_manuals ${packed})
+endforeach()
+add_custom_target(quorl_manuals ALL DEPENDS ${packed_manuals})
+install(FILES ${packed_manuals} DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
+install(FILES ${PROJECT_SOURCE_DIR}/README.md ${PROJECT_SOURCE_DIR}/CHANGELOG.md ${PROJECT_SOURCE_DIR}/SECURITY.md
+        DESTINATION ${CMAKE_INSTALL_DOCDIR})
+
+if(TARGET quorl-simulator)
+  set(QUORL_RELEASE_DATE 2026-11-21)
+  configure_file(${PROJECT_SOURCE_DIR}/packaging/com.ardent.quorl.metainfo.xml.in
+                 ${CMAKE_BINARY_DIR}/packaging/com.ardent.quorl.metainfo.xml @ONLY)
+  install(FILES ${CMAKE_BINARY_DIR}/packaging/com.ardent.quorl.metainfo.xml
+          DESTINATION ${CMAKE_INSTALL_DATADIR}/metainfo)
+  install(FILES ${PROJECT_SOURCE_DIR}/packaging/com.ardent.quorl.desktop
+          DESTINATION ${CMAKE_INSTALL_DATADIR}/applications)
+  install(FILES ${PROJECT_SOURCE_DIR}/packaging/com.ardent.quorl.svg
+          DESTINATION ${CMAKE_INSTALL_DATADIR}/icons/hicolor/scalable/apps)
+endif()
+
+set(CPACK_GENERATOR DEB)
+set(CPACK_PACKAGE_NAME quorl)
+set(CPACK_PACKAGE_VENDOR "The Quorl developers")
+set(CPACK_PACKAGE_CONTACT "The Quorl developers <quorl@localhost>")
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "cellular diagnostics monitor")
+set(CPACK_DEBIAN_PACKAGE_DESCRIPTION
+    "Shows what the baseband of a phone is doing now and what it did over the last\n\
+ thirty days: a dashboard of pinned attributes, metrics by technology, details,\n\
+ history, export and log capture. This package runs it on a simulated phone.")
+set(CPACK_STRIP_FILES ON)
+set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
+set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
+set(CPACK_DEBIAN_PACKAGE_SECTION net)
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
+if(TARGET quorl-simulator)
+  # What QML loads at run time, which no linker sees.
+  set(CPACK_DEBIAN_PACKAGE_DEPENDS
+      "qml6-module-qtquick, qml6-module-qtquick-controls, qml6-module-qtquick-dialogs, qml6-module-qtquick-layouts, \
+qml6-module-qtquick-shapes, qml6-module-qtquick-templates, qml6-module-qtquick-window, qml6-module-qtqml, \
+qml6-module-qtqml-models, qml6-module-qtqml-workerscript, libqt6svg6, qt6-qpa-plugins")
+  set(CPACK_DEBIAN_PACKAGE_RECOMMENDS "fonts-inter")
+endif()
+include(CPack)
