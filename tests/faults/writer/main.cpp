@@ -1,0 +1,69 @@
+// The product on a simulated phone that takes metrics until somebody kills it, and tells of each row as soon as the
+// product does: fault_writer DOCUMENTS FIRST. Metric number n carries the time FIRST + n, in milliseconds, and its
+// report is one line with that number.
+
+#include <charconv>
+#include <cstdint>
+#include <cstring>
+#include <string>
+
+#include <unistd.h>
+
+#include "app/AppDelegate.h"
+#include "app/ApplicationLoop.h"
+#include "base/NotificationCenter.h"
+#include "hosts/simulator/SimulatedPhone.h"
+#include "messages/classes/nas_context.h"
+#include "messages/wire/WireWriter.h"
+#include "shell/NotificationNames.h"
+#include "store/Metric.h"
+
+namespace {
+
+using namespace quorl;
+
+constexpr std::int64_t kNasMetricId = 3986700;
+
+zelkor::KeyValueMessage event(std::uint64_t timestampMs) {
+  KCellularEmmContext message;
+  message.setTimestamp(timestampMs);
+  message.setRegStatus(0);
+  message.setSubsId(0);
+  WireWriter writer;
+  message.writeTo(writer);
+  zelkor::KeyValueMessage event;
+  event.set(zelkor::kKeyMetricID, kNasMetricId);
+  event.set(zelkor::kKeyPayload, ByteString(writer.bytes()));
+  return event;
+}
+
+void report(const Notification& news) {
+  const auto* row = news.entry<Metric>(notification::kMetricObjectKey);
+  if (row == nullptr || row->attributeNameNonLocalized != "timestamp") return;
+  const std::string line = row->attributeValue + "\n";
+  // One write, so that no report is cut in two.
+  if (::write(STDOUT_FILENO, line.data(), line.size()) != static_cast<ssize_t>(line.size())) ::_exit(1);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  std::uint64_t timestampMs = 0;
+  if (argc != 3 || std::from_chars(argv[2], argv[2] + std::strlen(argv[2]), timestampMs).ec != std::errc()) return 2;
+
+  simulator::SimulatedPhone::Options options;
+  options.device.chipset = "ice15";
+  options.documents = argv[1];
+  options.resources = {QUORL_RESOURCE_DIRECTORY};
+  options.isConsoleShown = false;
+  simulator::SimulatedPhone phone(options);
+  AppDelegate application;
+  ApplicationLoop lifecycle(application);
+  const auto observation = NotificationCenter::defaultCenter().observe(notification::kNewZelkorMetric, report);
+  lifecycle.launch();
+  for (;;) {
+    for (int i = 0; i < 20; ++i)
+      if (!phone.baseband().deliver(zelkor::kEventMetric, event(timestampMs++))) return 1;
+    phone.runUntilAtRest();
+  }
+}
