@@ -15,12 +15,25 @@ namespace {
 
 using zelkor::KeyValueMessage;
 
-KeyValueMessage addConfiguration(std::string_view content = "configuration") {
+constexpr char kConfiguration[] = R"({
+  "applicationId": 2, "payloadType": 0, "profileId": 0,
+  "triggers": [{"triggerId": 5202011, "triggerType": 0, "triggerRef": 9999}],
+  "metrics": [806915, 803010, 827648]
+})";
+
+KeyValueMessage addConfiguration(std::string_view content = kConfiguration) {
   KeyValueMessage message;
   message.set(zelkor::kKeyAppID, std::int64_t{2});
   message.set(zelkor::kKeyPayload, ByteString(content));
   message.set(zelkor::kKeyPayloadType, std::int64_t{0});
   return message;
+}
+
+/// A configuration with this list of metrics.
+std::string configurationOf(std::string_view metrics) {
+  std::string content(kConfiguration);
+  content.replace(content.find("[806915"), std::string_view("[806915, 803010, 827648]").size(), metrics);
+  return content;
 }
 
 KeyValueMessage clearConfiguration() {
@@ -95,7 +108,7 @@ TEST_F(SimulatedBaseband, TakesTheThreeCommandsOfTheProduct) {
 TEST_F(SimulatedBaseband, DoesNotCareAboutTheOrderOfKeys) {
   KeyValueMessage turned;
   turned.set(zelkor::kKeyPayloadType, std::int64_t{0});
-  turned.set(zelkor::kKeyPayload, ByteString("configuration"));
+  turned.set(zelkor::kKeyPayload, ByteString(kConfiguration));
   turned.set(zelkor::kKeyAppID, std::int64_t{2});
   EXPECT_EQ(perform(zelkor::kCommandAddConfiguration, turned).code, 0);
 }
@@ -262,6 +275,110 @@ TEST_F(SimulatedBaseband, HandlerMayCallTheLibrary) {
   deliver(2);
   time.settle();
   EXPECT_EQ(calls, 1);
+}
+
+TEST_F(SimulatedBaseband, DeliversOfWhatComesUpByItselfOnlyWhatTheConfigurationLists) {
+  listen();
+  EXPECT_FALSE(library.deliverSelected(metric(806915))) << "there is no configuration yet";
+  subscribe();
+  EXPECT_TRUE(library.deliverSelected(metric(806915)));
+  EXPECT_FALSE(library.deliverSelected(metric(806914)));
+  EXPECT_FALSE(library.deliverSelected(KeyValueMessage())) << "no id at all";
+  EXPECT_TRUE(library.deliverSelected(metric(827648)));
+  time.settle();
+  EXPECT_EQ(received, (std::vector<std::int64_t>{806915, 827648}));
+}
+
+TEST_F(SimulatedBaseband, ALaterConfigurationTakesThePlaceOfTheEarlierOne) {
+  subscribe();
+  listen();
+  ASSERT_EQ(code(zelkor::kCommandAddConfiguration, addConfiguration(configurationOf("[806914]"))),
+            CommandCode::Success);
+  EXPECT_FALSE(library.deliverSelected(metric(806915)));
+  EXPECT_TRUE(library.deliverSelected(metric(806914)));
+}
+
+TEST_F(SimulatedBaseband, ARefusedConfigurationLeavesTheEarlierOne) {
+  subscribe();
+  listen();
+  ASSERT_EQ(code(zelkor::kCommandAddConfiguration, addConfiguration(configurationOf("[]"))),
+            CommandCode::ConfigurationValue);
+  EXPECT_TRUE(library.deliverSelected(metric(806915)));
+}
+
+TEST_F(SimulatedBaseband, PlaysARecordingAsItIs) {
+  subscribe();
+  listen();
+  EXPECT_TRUE(deliver(4711)) << "not in the configuration";
+}
+
+TEST_F(SimulatedBaseband, AQueryAsksTheHostForAllThatIsConfigured) {
+  std::vector<std::int64_t> asked;
+  library.setSnapshotSource([&asked](const SnapshotRequest& request) {
+    asked = request.metrics;
+    EXPECT_EQ(request.triggerRef, 9999);
+    for (const std::int64_t id : request.metrics) EXPECT_TRUE(request.deliver(metric(id)));
+  });
+  subscribe();
+  listen();
+  EXPECT_EQ(code(zelkor::kCommandQueryMetric, queryMetric()), CommandCode::Success);
+  EXPECT_EQ(asked, (std::vector<std::int64_t>{806915, 803010, 827648}));
+  time.settle();
+  EXPECT_EQ(received, asked);
+  EXPECT_EQ(code(zelkor::kCommandQueryMetric, with(queryMetric(), zelkor::kKeyMetricID, std::int64_t{803010})),
+            CommandCode::Success);
+  EXPECT_EQ(asked, std::vector<std::int64_t>{803010}) << "one of them";
+}
+
+TEST_F(SimulatedBaseband, ASnapshotGoesToTheClientThatAsked) {
+  library.setSnapshotSource([](const SnapshotRequest& request) { request.deliver(metric(803010)); });
+  const auto other = library.CreateManager("other", queue);
+  int ofTheOther = 0;
+  library.RegisterEventHandler(other, zelkor::kEventMetric, [&](const auto&, const auto&) { ++ofTheOther; });
+  library.EventsOn(other);
+  KeyValueMessage response;
+  library.PerformCommand(other, zelkor::kCommandAddConfiguration, addConfiguration(), response);
+  subscribe();
+  listen();
+  perform(zelkor::kCommandQueryMetric, queryMetric());
+  time.settle();
+  EXPECT_EQ(received, std::vector<std::int64_t>{803010});
+  EXPECT_EQ(ofTheOther, 0);
+}
+
+TEST_F(SimulatedBaseband, ASnapshotThatIsLateForItsConfigurationIsDropped) {
+  std::vector<SnapshotRequest> open;
+  library.setSnapshotSource([&open](SnapshotRequest request) { open.push_back(std::move(request)); });
+  subscribe();
+  listen();
+  perform(zelkor::kCommandQueryMetric, queryMetric());
+  ASSERT_EQ(open.size(), 1U);
+  EXPECT_TRUE(open[0].deliver(metric(803010)));
+  withdraw();
+  EXPECT_FALSE(open[0].deliver(metric(803010)));
+  subscribe();
+  EXPECT_FALSE(open[0].deliver(metric(803010))) << "another configuration";
+  manager.reset();
+  EXPECT_FALSE(open[0].deliver(metric(803010)));
+  time.settle();
+  EXPECT_TRUE(received.empty());
+}
+
+TEST_F(SimulatedBaseband, RefusesQueriesThatTheConfigurationDoesNotProvideFor) {
+  subscribe();
+  const auto refusal = [this](std::string_view key, std::int64_t value) {
+    const auto result = perform(zelkor::kCommandQueryMetric, with(queryMetric(), key, value));
+    return std::pair(static_cast<CommandCode>(result.code), result.text);
+  };
+  EXPECT_EQ(refusal(zelkor::kKeyTriggerID, 7),
+            std::pair(CommandCode::UnknownTrigger,
+                      std::string("the configuration lists no trigger 7 of type 0 and reference 9999")));
+  EXPECT_EQ(refusal(zelkor::kKeyTriggerType, 1).first, CommandCode::UnknownTrigger);
+  EXPECT_EQ(refusal(zelkor::kKeyTriggerRef, 1).first, CommandCode::UnknownTrigger);
+  EXPECT_EQ(refusal(zelkor::kKeyProfileID, 3),
+            std::pair(CommandCode::UnknownTrigger, std::string("the configuration is not for profile 3")));
+  EXPECT_EQ(refusal(zelkor::kKeyMetricID, 806914),
+            std::pair(CommandCode::UnselectedMetric, std::string("the configuration lists no metric 806914")));
 }
 
 TEST_F(SimulatedBaseband, ForgetsClientsThatAreGone) {

@@ -9,6 +9,8 @@
 
 #include <fmt/format.h>
 
+#include "hosts/simulator/Configuration.h"
+
 namespace quorl::simulator {
 
 namespace client = zelkor::client;
@@ -17,6 +19,7 @@ namespace {
 
 constexpr std::int64_t kApplicationId = 2;
 constexpr std::int64_t kProtofPayload = 0;
+constexpr std::int64_t kAllMetrics = 0;
 
 enum class ValueType { Integer, Bytes };
 
@@ -80,8 +83,23 @@ std::optional<client::Result> messageFault(std::string_view command, const zelko
     return answer(CommandCode::UnknownApplication, fmt::format("there is no application {}", *appId));
   if (const auto type = message.integer(zelkor::kKeyPayloadType); type && type != kProtofPayload)
     return answer(CommandCode::UnknownPayloadType, fmt::format("there is no payload type {}", *type));
-  if (const auto payload = message.bytes(zelkor::kKeyPayload); payload && payload->empty())
-    return answer(CommandCode::EmptyConfiguration, "the configuration is empty");
+  return std::nullopt;
+}
+
+/// What is wrong with a query of a client with this configuration.
+std::optional<client::Result> queryFault(const Configuration& configuration, const zelkor::KeyValueMessage& query) {
+  const Configuration::Trigger trigger{*query.integer(zelkor::kKeyTriggerID), *query.integer(zelkor::kKeyTriggerType),
+                                       *query.integer(zelkor::kKeyTriggerRef)};
+  const auto& listed = configuration.triggers;
+  if (std::find(listed.begin(), listed.end(), trigger) == listed.end()) {
+    return answer(CommandCode::UnknownTrigger, fmt::format("the configuration lists no trigger {} of type {} and "
+                                                           "reference {}",
+                                                           trigger.id, trigger.type, trigger.ref));
+  }
+  if (const auto profile = query.integer(zelkor::kKeyProfileID); profile != configuration.profileId)
+    return answer(CommandCode::UnknownTrigger, fmt::format("the configuration is not for profile {}", *profile));
+  if (const auto metric = query.integer(zelkor::kKeyMetricID); metric != kAllMetrics && !configuration.selects(*metric))
+    return answer(CommandCode::UnselectedMetric, fmt::format("the configuration lists no metric {}", *metric));
   return std::nullopt;
 }
 
@@ -102,18 +120,34 @@ class BasebandManager::Client final : public client::Manager, public std::enable
     eventsOn_ = isOn;
   }
 
-  client::Result perform(std::string_view command, const zelkor::KeyValueMessage& message) {
-    if (auto fault = messageFault(command, message)) return *std::move(fault);
+  client::Result addConfiguration(const zelkor::KeyValueMessage& message) {
+    auto parsed = parseConfiguration(message.bytes(zelkor::kKeyPayload)->view());
+    if (!parsed) return answer(parsed.error().code, std::move(parsed.error().text));
     const std::lock_guard lock(mutex_);
-    if (command == zelkor::kCommandAddConfiguration) {
-      configuration_ = message.bytes(zelkor::kKeyPayload);
-    } else if (command == zelkor::kCommandClearConfiguration) {
-      configuration_.reset();
-      ++withdrawals_;
-    } else if (!configuration_) {
-      return answer(CommandCode::MissingConfiguration, "no configuration is added");
-    }
+    configuration_ = *std::move(parsed);
     return answer(CommandCode::Success, "success");
+  }
+
+  void clearConfiguration() {
+    const std::lock_guard lock(mutex_);
+    configuration_.reset();
+    ++withdrawals_;
+  }
+
+  /// What the query asks for, or why it asks in vain.
+  tl::expected<SnapshotRequest, client::Result> query(const zelkor::KeyValueMessage& message) {
+    const std::lock_guard lock(mutex_);
+    if (!configuration_) return tl::unexpected(answer(CommandCode::MissingConfiguration, "no configuration is added"));
+    if (auto fault = queryFault(*configuration_, message)) return tl::unexpected(*std::move(fault));
+    SnapshotRequest request;
+    const std::int64_t metric = *message.integer(zelkor::kKeyMetricID);
+    request.metrics = metric == kAllMetrics ? configuration_->metrics : std::vector{metric};
+    request.triggerRef = *message.integer(zelkor::kKeyTriggerRef);
+    request.deliver = [weak = weak_from_this(), asOf = withdrawals_](const zelkor::KeyValueMessage& metricMessage) {
+      const auto self = weak.lock();
+      return self != nullptr && self->enqueueAsOf(asOf, metricMessage);
+    };
+    return request;
   }
 
   bool enqueue(std::string_view event, const zelkor::KeyValueMessage& message) {
@@ -123,6 +157,18 @@ class BasebandManager::Client final : public client::Manager, public std::enable
       self->handle(name, message, asOf);
     });
     return true;
+  }
+
+  bool enqueueSelected(const zelkor::KeyValueMessage& message) {
+    const auto metricId = message.integer(zelkor::kKeyMetricID);
+    const std::lock_guard lock(mutex_);
+    if (!metricId || !configuration_ || !configuration_->selects(*metricId)) return false;
+    return enqueue(zelkor::kEventMetric, message);
+  }
+
+  bool enqueueAsOf(std::uint64_t withdrawals, const zelkor::KeyValueMessage& message) {
+    const std::lock_guard lock(mutex_);
+    return withdrawals == withdrawals_ && enqueue(zelkor::kEventMetric, message);
   }
 
  private:
@@ -138,7 +184,7 @@ class BasebandManager::Client final : public client::Manager, public std::enable
   std::recursive_mutex mutex_;
   // Guarded by mutex_.
   std::map<std::string, client::EventHandler, std::less<>> handlers_;
-  std::optional<ByteString> configuration_;
+  std::optional<Configuration> configuration_;
   std::uint64_t withdrawals_ = 0;  // an event still queued when its configuration is cleared belongs to nobody
   bool eventsOn_ = false;
 };
@@ -170,18 +216,45 @@ client::Result BasebandManager::PerformCommand(const std::shared_ptr<client::Man
                                                zelkor::KeyValueMessage& /*response*/) {
   auto* own = dynamic_cast<Client*>(manager.get());
   if (own == nullptr) return answer(CommandCode::ForeignManager, "the manager handle is not one of this library");
-  return own->perform(command, message);
+  if (auto fault = messageFault(command, message)) return *std::move(fault);
+  if (command == zelkor::kCommandAddConfiguration) return own->addConfiguration(message);
+  if (command == zelkor::kCommandClearConfiguration) {
+    own->clearConfiguration();
+    return answer(CommandCode::Success, "success");
+  }
+  auto request = own->query(message);
+  if (!request) return std::move(request.error());
+  std::function<void(SnapshotRequest)> source;
+  {
+    const std::lock_guard lock(mutex_);
+    source = snapshotSource_;
+  }
+  if (source) source(*std::move(request));
+  return answer(CommandCode::Success, "success");
+}
+
+void BasebandManager::setSnapshotSource(std::function<void(SnapshotRequest request)> source) {
+  const std::lock_guard lock(mutex_);
+  snapshotSource_ = std::move(source);
+}
+
+std::vector<std::shared_ptr<BasebandManager::Client>> BasebandManager::liveClients() {
+  std::vector<std::shared_ptr<Client>> clients;
+  const std::lock_guard lock(mutex_);
+  for (const std::weak_ptr<Client>& registered : clients_)
+    if (auto live = registered.lock()) clients.push_back(std::move(live));
+  return clients;
 }
 
 bool BasebandManager::deliver(std::string_view event, const zelkor::KeyValueMessage& message) {
-  std::vector<std::shared_ptr<Client>> clients;
-  {
-    const std::lock_guard lock(mutex_);
-    for (const std::weak_ptr<Client>& registered : clients_)
-      if (auto live = registered.lock()) clients.push_back(std::move(live));
-  }
   bool isTaken = false;
-  for (const std::shared_ptr<Client>& each : clients) isTaken = each->enqueue(event, message) || isTaken;
+  for (const std::shared_ptr<Client>& each : liveClients()) isTaken = each->enqueue(event, message) || isTaken;
+  return isTaken;
+}
+
+bool BasebandManager::deliverSelected(const zelkor::KeyValueMessage& message) {
+  bool isTaken = false;
+  for (const std::shared_ptr<Client>& each : liveClients()) isTaken = each->enqueueSelected(message) || isTaken;
   return isTaken;
 }
 

@@ -1,33 +1,30 @@
 #pragma once
 
+#include <cstdint>
+#include <functional>
 #include <memory>
 #include <mutex>
 #include <string_view>
 #include <vector>
 
+#include "hosts/simulator/CommandCode.h"
 #include "platform/ZelkorClient.h"
 
 namespace quorl::simulator {
 
-/// Codes with which the simulated baseband manager answers a command. 0 is success.
-enum class CommandCode {
-  Success = 0,
-  ForeignManager = 1,        // the handle was not made by this library
-  UnknownCommand = 2,        // no command of that name
-  MissingKey = 3,            // a key that the command must carry is not there
-  UnexpectedKey = 4,         // a key that the command does not carry
-  WrongType = 5,             // a value of another type than the key's
-  UnknownApplication = 6,    // an application id other than 2
-  UnknownPayloadType = 7,    // a payload type other than 0
-  EmptyConfiguration = 8,    // a configuration without content
-  MissingConfiguration = 9,  // a query while no configuration is added
+/// A client asks for all its current metrics.
+struct SnapshotRequest {
+  std::vector<std::int64_t> metrics;  // the ids it wants, in the order of its configuration
+  std::int64_t triggerRef = 0;        // comes back with each event
+  /// Queues one metric event for the client that asks. False when the configuration that it asked under is gone.
+  std::function<bool(const zelkor::KeyValueMessage& message)> deliver;
 };
 
 /// A baseband manager in this process, behind the same five operations as the device's own.
 ///
-/// It checks every command key by key and says what is wrong. It makes no events of its own: the host hands them in
-/// with `deliver`. A client gets an event only while it has a configuration and its events are on, so playing starts
-/// with the first and ends when either goes. It does not look into a configuration, and delivers whatever it is given.
+/// It checks every command key by key, and a configuration too, and says what is wrong. It makes no events of its own:
+/// the host hands them in. A client gets an event only while it has a configuration and its events are on, so playing
+/// starts with the first and ends when either goes.
 ///
 /// Thread-safe. A handler runs on the queue of its manager and may call the library, but must not wait for a thread
 /// that does: commands that withdraw something wait for the handler at hand, so that nothing comes after them.
@@ -43,14 +40,24 @@ class BasebandManager final : public zelkor::client::Library {
                                         std::string_view command, const zelkor::KeyValueMessage& message,
                                         zelkor::KeyValueMessage& response) override;
 
-  /// Queues one event for every client that may have it now. False when there is none; the event is gone then.
+  /// Queues one event for every client that may have it now. False when there is none; the event is gone then. What a
+  /// configuration selects does not matter: a recording is what was delivered, and goes as it is.
   bool deliver(std::string_view event, const zelkor::KeyValueMessage& message);
+  /// The same for a metric event that comes up by itself: only clients whose configuration lists its id get it.
+  bool deliverSelected(const zelkor::KeyValueMessage& message);
+
+  /// Who answers queries from now on; without one a query is accepted and brings nothing. Called inside the command
+  /// and on its thread, once per query; it may deliver at once or later.
+  void setSnapshotSource(std::function<void(SnapshotRequest request)> source);
 
  private:
   class Client;
 
+  std::vector<std::shared_ptr<Client>> liveClients();
+
   std::mutex mutex_;
-  std::vector<std::weak_ptr<Client>> clients_;  // guarded by mutex_
+  std::function<void(SnapshotRequest)> snapshotSource_;  // guarded by mutex_
+  std::vector<std::weak_ptr<Client>> clients_;           // guarded by mutex_
 };
 
 }  // namespace quorl::simulator
