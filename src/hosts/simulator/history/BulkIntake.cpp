@@ -1,0 +1,32 @@
+#include "hosts/simulator/history/BulkIntake.h"
+
+#include <utility>
+
+#include "intake/ZelkorWrapper.h"
+
+namespace quorl::simulator {
+
+tl::expected<std::unique_ptr<BulkIntake>, std::string> BulkIntake::open(const std::filesystem::path& database) {
+  auto store = BulkStore::open(database);
+  if (!store) return tl::unexpected(database.string() + ": " + store.error());
+  return std::unique_ptr<BulkIntake>(new BulkIntake(database, *std::move(store)));
+}
+
+BulkIntake::BulkIntake(std::filesystem::path database, std::unique_ptr<BulkStore> store)
+    : database_(std::move(database)),
+      store_(std::move(store)),
+      service_(MetricService::make(*store_, ZelkorWrapper::sharedInstance())) {}
+
+bool BulkIntake::take(const RecordedEvent& event) {
+  if (store_->hasFailed()) return false;
+  service_->processMetric(event.message());
+  ++events_;
+  return !store_->hasFailed();
+}
+
+tl::expected<void, std::string> BulkIntake::finish() {
+  if (auto outcome = store_->finish(); !outcome) return tl::unexpected(database_.string() + ": " + outcome.error());
+  return {};
+}
+
+}  // namespace quorl::simulator

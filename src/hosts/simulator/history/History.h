@@ -1,0 +1,42 @@
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <functional>
+#include <string>
+
+#include <tl/expected.hpp>
+
+#include "base/Clock.h"
+#include "hosts/simulator/ScenarioRun.h"
+
+namespace quorl::simulator {
+
+/// A past in which somebody looked at the product some times a day, on the way through a scenario: metrics come only
+/// while it is in the foreground.
+struct HistoryPlan {
+  ScenarioChoice choice;
+  int days = 1;                     // up to `until`
+  Date until;                       // nothing is later than this
+  int sessionsPerDay = 6;           // spread over the waking hours
+  std::chrono::minutes session{5};  // length of one
+};
+
+struct HistoryProgress {
+  int sessionsDone = 0;
+  int sessions = 0;
+  std::uint64_t events = 0;
+  std::uint64_t rows = 0;
+};
+
+/// Writes the rows of a history into a database file, in bulk. `progress` is called after each session and may be
+/// empty. The error says in one line what went wrong; what was written before it stays.
+///
+/// Main thread, on an installed platform whose device is of the plan's family, and before the product is started.
+tl::expected<HistoryProgress, std::string> writeHistory(const std::filesystem::path& database, const HistoryPlan& plan,
+                                                        const std::function<void(const HistoryProgress&)>& progress);
+
+/// When the sessions of a plan begin, earliest first. The same plan gives the same times.
+std::vector<Date> sessionTimes(const HistoryPlan& plan);
+
+}  // namespace quorl::simulator
