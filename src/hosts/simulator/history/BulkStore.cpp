@@ -59,6 +59,10 @@ bool BulkStore::run(const char* sql) {
   return sqlite3_exec(database_.get(), sql, nullptr, nullptr, nullptr) == SQLITE_OK;
 }
 
+void BulkStore::limitPages(int pages) {
+  run(("PRAGMA max_page_count = " + std::to_string(pages)).c_str());
+}
+
 void BulkStore::fail() {
   if (failure_.empty()) failure_ = sqlite3_errmsg(database_.get());
 }

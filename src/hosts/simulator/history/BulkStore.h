@@ -32,6 +32,8 @@ class BulkStore final : public PersistanceStoreProtocol {
   BulkStore(const BulkStore&) = delete;
   BulkStore& operator=(const BulkStore&) = delete;
 
+  /// The file may not grow beyond this many pages of the database from now on.
+  void limitPages(int pages);
   /// Rows taken so far.
   std::uint64_t rows() const { return rows_; }
   bool hasFailed() const { return !failure_.empty(); }

@@ -30,7 +30,7 @@ ByteString damaged(const ByteString& payload, std::uint64_t salt, std::uint32_t 
   switch (static_cast<Damage>(number % kDamages)) {
     case Damage::CutOff:
       octets.resize(place(random, octets.size()));
-      octets += kUnknownBytesKey;
+      octets.push_back(kUnknownBytesKey[0]);  // a number that goes on where nothing comes any more
       break;
     case Damage::TurnedBits:
       for (int turn = 0; turn < 4 && !octets.empty(); ++turn) {

@@ -1,0 +1,60 @@
+#include <set>
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "hosts/simulator/metrics/HostilePayloads.h"
+#include "messages/classes/lte_rrc.h"
+#include "messages/wire/WireWriter.h"
+
+namespace quorl::simulator::metrics {
+namespace {
+
+ByteString attempt() {
+  CellularLteRachAttempt message;
+  message.setTimestamp(1700000000123);
+  message.setSubsId(1);
+  message.setRsrp(-97);
+  WireWriter writer;
+  message.writeTo(writer);
+  return ByteString(writer.bytes());
+}
+
+bool isReadable(const ByteString& payload) {
+  CellularLteRachAttempt message;
+  message.initWithData(payload);
+  return message.dictionaryRepresentation().has_value();
+}
+
+TEST(HostilePayloads, SixInARowAreDamagedInSixWays) {
+  std::set<std::string> made;
+  int unreadable = 0;
+  for (std::uint32_t number = 0; number < 6; ++number) {
+    const ByteString payload = damaged(attempt(), 7, number);
+    made.insert(std::string(payload.view()));
+    unreadable += isReadable(payload) ? 0 : 1;
+  }
+  EXPECT_EQ(made.size(), 6U);
+  EXPECT_GE(unreadable, 4) << "turned bits and noise may happen to make sense";
+}
+
+TEST(HostilePayloads, AreTheSameForTheSameSaltAndNumber) {
+  for (std::uint32_t number = 0; number < 12; ++number)
+    EXPECT_EQ(damaged(attempt(), 7, number), damaged(attempt(), 7, number));
+}
+
+TEST(HostilePayloads, CanBeMadeOfNothing) {
+  for (std::uint32_t number = 0; number < 12; ++number) damaged(ByteString(), 7, number);
+}
+
+TEST(HostilePayloads, OneThatIsInflatedStillReads) {
+  const ByteString payload = inflated(attempt(), 1000000);
+  EXPECT_GT(payload.view().size(), 1000000U);
+  CellularLteRachAttempt message;
+  message.initWithData(payload);
+  ASSERT_TRUE(message.dictionaryRepresentation());
+  EXPECT_EQ(message.rsrp(), -97);
+}
+
+}  // namespace
+}  // namespace quorl::simulator::metrics
