@@ -27,6 +27,7 @@ void addCarriers(CLI::App& tool, Action& chosen);
 void addSchema(CLI::App& tool, Action& chosen);
 void addSummary(CLI::App& tool, Action& chosen);
 void addMakeRecording(CLI::App& tool, Action& chosen);
+void addSimulate(CLI::App& tool, Action& chosen);
 
 // On a database that replay made, by what the screens compute.
 void addMetrics(CLI::App& tool, Action& chosen);

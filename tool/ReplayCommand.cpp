@@ -1,5 +1,4 @@
 #include <algorithm>
-#include <atomic>
 #include <chrono>
 #include <cmath>
 #include <cstdint>
@@ -19,16 +18,15 @@
 #include "Documents.h"
 #include "MessageJson.h"
 #include "Player.h"
+#include "RowCounter.h"
 #include "TimeShift.h"
 #include "ToolLog.h"
 #include "app/AppDelegate.h"
 #include "app/ApplicationLoop.h"
-#include "base/NotificationCenter.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/SimulatedPhone.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MetricCodable.h"
-#include "shell/NotificationNames.h"
 
 namespace quorl::tool {
 namespace {
@@ -93,23 +91,6 @@ void countEvent(const RecordedEvent& event, Summary& summary) {
   if (!hasRow) ++summary.eventsWithoutRow;
   if (!isReadableOnAllRows) ++summary.unreadablePayloads;
 }
-
-/// Counts the rows that reach the store, from either source.
-class RowCounter {
- public:
-  RowCounter()
-      : fromChannel_(observe(notification::kNewZelkorMetric)), fromTelephony_(observe(notification::kNewHVMetric)) {}
-  std::uint64_t count() const { return rows_.load(); }
-
- private:
-  NotificationCenter::Observation observe(const char* name) {
-    return NotificationCenter::defaultCenter().observe(name, [this](const Notification&) { ++rows_; });
-  }
-
-  std::atomic<std::uint64_t> rows_{0};
-  NotificationCenter::Observation fromChannel_;
-  NotificationCenter::Observation fromTelephony_;
-};
 
 void print(const Summary& summary) {
   std::cout << jsonLine({{"events", summary.events},

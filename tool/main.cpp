@@ -36,6 +36,7 @@ int main(int argc, char** argv) {
   tool.require_subcommand(1);
   Action chosen;
   addReplay(tool, chosen);
+  addSimulate(tool, chosen);
   addCarriers(tool, chosen);
   addSummary(tool, chosen);
   addMetrics(tool, chosen);

@@ -1,8 +1,11 @@
 #include "hosts/simulator/LiveScenario.h"
 
 #include <algorithm>
+#include <atomic>
 #include <cmath>
 #include <utility>
+
+#include "hosts/simulator/TelephonyFeed.h"
 
 namespace quorl::simulator {
 namespace {
@@ -28,6 +31,8 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
         mainQueue_(surroundings.mainQueue),
         clock_(surroundings.clock),
         queue_(surroundings.queues.makeSerialQueue("modem")),
+        telephony_(surroundings.telephony != nullptr ? std::optional<TelephonyFeed>(*surroundings.telephony)
+                                                     : std::nullopt),
         run_(std::move(options.choice), millisecondsSince1970(surroundings.clock.now())),
         writer_(std::move(writer)) {}
 
@@ -53,17 +58,23 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
     run_.advance(
         duration,
         [this](const RecordedEvent& event) {
-          if (baseband_.deliverSelected(event.message()) && writer_) writer_->write(event);
+          if (baseband_.deliverSelected(event.message())) delivered(event);
         },
-        observer_);
+        [this](const network::ModemEvent& event, const network::SubscriptionState& state) {
+          if (telephony_) telephony_->happened(event, state);
+          if (observer_) observer_(event, state);
+        });
   }
 
   void answer(const SnapshotRequest& request) {
     run_.snapshot(request.metrics, [this, &request](RecordedEvent event) {
       event.triggerRef = request.triggerRef;
-      if (request.deliver(event.message()) && writer_) writer_->write(event);
+      if (request.deliver(event.message())) delivered(event);
     });
   }
+
+  /// Any thread.
+  std::uint64_t events() const { return events_.load(std::memory_order_relaxed); }
 
   RecordingWriter::Outcome finishRecording() {
     if (!writer_) return {};
@@ -73,6 +84,11 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
   }
 
  private:
+  void delivered(const RecordedEvent& event) {
+    events_.fetch_add(1, std::memory_order_relaxed);
+    if (writer_) writer_->write(event);
+  }
+
   /// The main queue stands between two steps.
   void planStep() {
     mainQueue_.async([weak = weak_from_this()] {
@@ -102,7 +118,9 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
   Queue& mainQueue_;
   const Clock& clock_;
   const std::shared_ptr<Queue> queue_;
+  std::atomic<std::uint64_t> events_{0};
   // On the queue alone.
+  std::optional<TelephonyFeed> telephony_;
   ScenarioRun run_;
   std::optional<RecordingWriter> writer_;
   Observer observer_;
@@ -147,6 +165,10 @@ void LiveScenario::stop() {
 
 void LiveScenario::advance(milliseconds duration) {
   core_->async([duration](Core& core) { core.advance(duration); });
+}
+
+std::uint64_t LiveScenario::events() const {
+  return core_->events();
 }
 
 void LiveScenario::finishRecording(std::function<void(RecordingWriter::Outcome outcome)> done) {

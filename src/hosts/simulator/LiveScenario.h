@@ -15,11 +15,12 @@
 #include "hosts/simulator/BasebandManager.h"
 #include "hosts/simulator/RecordingWriter.h"
 #include "hosts/simulator/ScenarioRun.h"
+#include "hosts/simulator/TelephonySimulator.h"
 
 namespace quorl::simulator {
 
 /// Lets a scenario happen beside the product: its metrics come out of the baseband manager as it goes, a query brings
-/// a snapshot of them, and the whole can be recorded.
+/// a snapshot of them, the telephony service tells of the same world, and the metrics can be recorded.
 ///
 /// The modem lives on a serial queue of its own. It waits for the main queue between two steps, so a product that
 /// cannot keep up makes the simulated time slower and nothing piles up.
@@ -27,11 +28,12 @@ class LiveScenario {
  public:
   struct Options {
     ScenarioChoice choice;
-    double speed = 1;                                // simulated seconds in a second, more than 0
-    std::optional<std::filesystem::path> recording;  // what is delivered is written there
+    double speed = 1;                                  // simulated seconds in a second, more than 0
+    std::optional<std::filesystem::path> recording{};  // what is delivered is written there
   };
   struct Surroundings {
     BasebandManager& baseband;
+    TelephonySimulator* telephony;  // null: it tells of another world, or of none
     QueueFactory& queues;
     Queue& mainQueue;
     const Clock& clock;
@@ -57,6 +59,8 @@ class LiveScenario {
   void stop();
   /// Lets this much simulated time pass at once.
   void advance(std::chrono::milliseconds duration);
+  /// Events delivered so far.
+  std::uint64_t events() const;
   /// Ends the recording. `done` is called on the modem's queue with what has come of it.
   void finishRecording(std::function<void(RecordingWriter::Outcome outcome)> done);
 

@@ -38,7 +38,7 @@ void ScenarioRun::advance(std::chrono::milliseconds duration, const Sink& sink, 
 void ScenarioRun::snapshot(std::span<const std::int64_t> wanted, const Sink& sink) {
   const auto deliver = delivering(sink);
   for (const std::uint8_t subscription : {std::uint8_t{0}, std::uint8_t{1}})
-    reporter_.snapshot(modem_.state(subscription), wanted, deliver);
+    reporter_.snapshot(modem_.state(subscription), modem_.nowMs(), wanted, deliver);
 }
 
 }  // namespace quorl::simulator

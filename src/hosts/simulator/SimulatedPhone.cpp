@@ -35,6 +35,13 @@ SimulatedPhone::~SimulatedPhone() {
   Platform::install(nullptr);
 }
 
+tl::expected<LiveScenario*, std::string> SimulatedPhone::live(LiveScenario::Options options) {
+  auto made = LiveScenario::make(std::move(options), {baseband_, &telephony_, queues_, mainQueue_, clock_});
+  if (!made) return tl::unexpected(std::move(made.error()));
+  scenario_ = *std::move(made);
+  return scenario_.get();
+}
+
 void SimulatedPhone::runUntilAtRest() {
   // Coming to rest stops the loop. A stop that comes between two rounds ends the next one early, hence the question.
   while (!activity_->isAtRest()) loop_->run();

@@ -5,9 +5,12 @@
 #include <optional>
 #include <vector>
 
+#include <tl/expected.hpp>
+
 #include "base/Clock.h"
 #include "base/SerialQueue.h"
 #include "hosts/simulator/BasebandManager.h"
+#include "hosts/simulator/LiveScenario.h"
 #include "hosts/simulator/PhoneServices.h"
 #include "hosts/simulator/SondrelSimulator.h"
 #include "hosts/simulator/TelephonySimulator.h"
@@ -42,6 +45,10 @@ class SimulatedPhone {
   Console& console() { return console_; }
   const KeptShare& share() const { return share_; }
 
+  /// Puts a scenario behind baseband manager and telephony, in place of whoever would hand in events; once at most. Its
+  /// time stands at first. The error says why its recording cannot be written.
+  tl::expected<LiveScenario*, std::string> live(LiveScenario::Options options);
+
   /// Runs the main queue until no queue of the phone has anything left to do now. Work that waits for its time is not
   /// waited for.
   void runUntilAtRest();
@@ -67,6 +74,7 @@ class SimulatedPhone {
   TelephonySimulator telephony_;
   std::optional<SondrelSimulator> sondrel_;  // where the device has such a class
   Platform platform_;
+  std::unique_ptr<LiveScenario> scenario_;
 };
 
 }  // namespace quorl::simulator

@@ -18,8 +18,8 @@ struct HistoryPlan {
   ScenarioChoice choice;
   int days = 1;                     // up to `until`
   Date until;                       // nothing is later than this
-  int sessionsPerDay = 6;           // spread over the waking hours
-  std::chrono::minutes session{5};  // length of one
+  int sessionsPerDay = 4;           // spread over the waking hours
+  std::chrono::minutes session{3};  // length of one
 };
 
 struct HistoryProgress {

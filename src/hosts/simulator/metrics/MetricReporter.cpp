@@ -38,21 +38,20 @@ MetricReporter::MetricReporter(Family family, std::uint64_t salt, std::uint64_t 
   for (const MetricKind& kind : kindsOf(family)) tracked_.push_back({kind, {}, {}});
 }
 
-bool MetricReporter::report(Tracked& tracked, const SubscriptionState& state, const network::ModemEventBody* event,
-                            const Sink& sink) {
+void MetricReporter::report(Tracked& tracked, const SubscriptionState& state, network::SimulatedMs nowMs,
+                            const network::ModemEventBody* event, const Sink& sink) {
   const std::size_t slot = state.subscription;
-  const Moment moment{state, event, startMs_ + state.nowMs, salt_, &tracked.baseline[slot]};
+  const Moment moment{state, event, startMs_ + nowMs, salt_, &tracked.baseline[slot]};
   std::optional<ByteString> payload = tracked.kind.make(moment);
-  if (!payload) return false;
-  tracked.lastMs[slot] = state.nowMs + 1;
-  if (tracked.kind.counts) tracked.baseline[slot] = {state.nowMs, state.counters};
-  last_ = {state.nowMs, tracked.kind.metricId, *std::move(payload)};
+  if (!payload) return;
+  tracked.lastMs[slot] = nowMs + 1;
+  if (tracked.kind.counts) tracked.baseline[slot] = {nowMs, state.counters};
+  last_ = {nowMs, tracked.kind.metricId, *std::move(payload)};
   sink(last_);
-  return true;
 }
 
 void MetricReporter::take(const network::ModemEvent& event, const SubscriptionState& state, const Sink& sink) {
-  if (const auto* cue = std::get_if<event::Cue>(&event.body)) return obey(*cue, state, sink);
+  if (const auto* cue = std::get_if<event::Cue>(&event.body)) return obey(*cue, event.atMs, sink);
   const EventSet set = setOf(event.body);
   const bool isRound = std::holds_alternative<event::Measured>(event.body);
   const bool isBusy = isConnected(state);
@@ -60,31 +59,32 @@ void MetricReporter::take(const network::ModemEvent& event, const SubscriptionSt
     if ((tracked.kind.occasions & set) == 0) continue;
     const std::uint64_t lastMs = tracked.lastMs[state.subscription];
     const std::uint32_t paceMs = isBusy ? tracked.kind.pace.connectedMs : tracked.kind.pace.idleMs;
-    if (isRound && lastMs != 0 && state.nowMs + 1 < lastMs + paceMs) continue;
-    report(tracked, state, &event.body, sink);
+    if (isRound && lastMs != 0 && event.atMs + 1 < lastMs + paceMs) continue;
+    report(tracked, state, event.atMs, &event.body, sink);
   }
 }
 
-void MetricReporter::snapshot(const SubscriptionState& state, std::span<const std::int64_t> wanted, const Sink& sink) {
+void MetricReporter::snapshot(const SubscriptionState& state, network::SimulatedMs nowMs,
+                              std::span<const std::int64_t> wanted, const Sink& sink) {
   if (!state.isSimPresent) return;
   for (Tracked& tracked : tracked_) {
     const bool isWanted = std::find(wanted.begin(), wanted.end(), tracked.kind.metricId) != wanted.end();
-    if (tracked.kind.isCurrent && isWanted) report(tracked, state, nullptr, sink);
+    if (tracked.kind.isCurrent && isWanted) report(tracked, state, nowMs, nullptr, sink);
   }
 }
 
 /// Traffic that has nothing to do with the radio, as a broken or malicious manager might deliver.
-void MetricReporter::obey(const event::Cue& cue, const SubscriptionState& state, const Sink& sink) {
+void MetricReporter::obey(const event::Cue& cue, network::SimulatedMs nowMs, const Sink& sink) const {
   for (std::uint32_t number = 0; number < cue.count; ++number) {
     switch (cue.kind) {
       case event::CueKind::Malformed:
-        sink({state.nowMs, last_.metricId, damaged(last_.payload, salt_ ^ state.nowMs, number)});
+        sink({nowMs, last_.metricId, damaged(last_.payload, salt_ ^ nowMs, number)});
         break;
       case event::CueKind::Oversized:
-        sink({state.nowMs, last_.metricId, inflated(last_.payload, cue.bytes)});
+        sink({nowMs, last_.metricId, inflated(last_.payload, cue.bytes)});
         break;
       case event::CueKind::Burst:
-        sink({state.nowMs, last_.metricId, last_.payload});
+        sink({nowMs, last_.metricId, last_.payload});
         break;
     }
   }

@@ -36,7 +36,9 @@ class MetricReporter {
   /// What the event calls for. `state` is its subscription's, right after it.
   void take(const network::ModemEvent& event, const network::SubscriptionState& state, const Sink& sink);
   /// The metrics of `wanted` that have a value now, in the order of the kinds. Nothing for a subscription without SIM.
-  void snapshot(const network::SubscriptionState& state, std::span<const std::int64_t> wanted, const Sink& sink);
+  /// `nowMs`: the modem's time; a state says when it last changed.
+  void snapshot(const network::SubscriptionState& state, network::SimulatedMs nowMs,
+                std::span<const std::int64_t> wanted, const Sink& sink);
 
  private:
   struct Tracked {
@@ -45,9 +47,9 @@ class MetricReporter {
     std::array<Baseline, 2> baseline;
   };
 
-  bool report(Tracked& tracked, const network::SubscriptionState& state, const network::ModemEventBody* event,
-              const Sink& sink);
-  void obey(const network::event::Cue& cue, const network::SubscriptionState& state, const Sink& sink);
+  void report(Tracked& tracked, const network::SubscriptionState& state, network::SimulatedMs nowMs,
+              const network::ModemEventBody* event, const Sink& sink);
+  void obey(const network::event::Cue& cue, network::SimulatedMs nowMs, const Sink& sink) const;
 
   const std::uint64_t salt_;
   const std::uint64_t startMs_;

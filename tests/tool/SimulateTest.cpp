@@ -1,0 +1,143 @@
+#include <filesystem>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+#include <sqlite3.h>
+
+#include "ProgressBar.h"
+#include "ToolRun.h"
+#include "hosts/simulator/Recording.h"
+#include "support/TemporaryDirectory.h"
+
+namespace quorl::test {
+namespace {
+
+namespace fs = std::filesystem;
+
+std::vector<std::string> rowsOf(const fs::path& file, const char* sql) {
+  sqlite3* handle = nullptr;
+  EXPECT_EQ(sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READONLY, nullptr), SQLITE_OK);
+  const std::unique_ptr<sqlite3, int (*)(sqlite3*)> closing(handle, sqlite3_close);
+  sqlite3_stmt* statement = nullptr;
+  EXPECT_EQ(sqlite3_prepare_v2(handle, sql, -1, &statement, nullptr), SQLITE_OK) << sqlite3_errmsg(handle);
+  const std::unique_ptr<sqlite3_stmt, int (*)(sqlite3_stmt*)> finalizing(statement, sqlite3_finalize);
+  std::vector<std::string> rows;
+  while (sqlite3_step(statement) == SQLITE_ROW) {
+    const unsigned char* text = sqlite3_column_text(statement, 0);
+    rows.emplace_back(text == nullptr ? "" : reinterpret_cast<const char*>(text));
+  }
+  return rows;
+}
+
+class Simulate : public testing::Test {
+ protected:
+  ToolResult simulate(std::vector<std::string> more) {
+    more.insert(more.begin(), {"simulate", "--scenario", "city"});
+    return runTool(more);
+  }
+  static nlohmann::json lastLine(const ToolResult& result) {
+    const auto lines = result.outputLines();
+    auto parsed = lines.empty() ? nlohmann::json() : nlohmann::json::parse(lines.back(), nullptr, false);
+    EXPECT_TRUE(parsed.is_object()) << testing::PrintToString(result);
+    return parsed;
+  }
+
+  TemporaryDirectory directory;
+  const fs::path recording = directory.path() / "way.jsonl";
+  const fs::path documents = directory.path() / "documents";
+  const fs::path database = documents / "metricPartV11.sqlite";
+};
+
+TEST_F(Simulate, WritesARecordingThatTheSameSeedRepeats) {
+  const auto result = simulate({"--seed", "3", "--minutes", "2", "--output", recording.string()});
+  EXPECT_EQ(result.exitCode, 0) << testing::PrintToString(result);
+  EXPECT_EQ(result.errors, "") << "no progress bar where there is no terminal";
+  const auto read = simulator::readRecording(recording);
+  ASSERT_TRUE(read);
+  EXPECT_TRUE(read->faults.empty());
+  EXPECT_EQ(lastLine(result)["events"], read->events.size());
+  const std::string first = readFile(recording);
+  simulate({"--seed", "3", "--minutes", "2", "--output", recording.string()});
+  EXPECT_TRUE(readFile(recording) == first);
+  simulate({"--seed", "4", "--minutes", "2", "--output", recording.string()});
+  EXPECT_FALSE(readFile(recording) == first);
+}
+
+TEST_F(Simulate, WhatTheProductWasDeliveredReplaysIntoTheSameRows) {
+  const auto lived = simulate(
+      {"--minutes", "0.5", "--documents", documents.string(), "--record", recording.string(), "--family", "ice"});
+  EXPECT_EQ(lived.exitCode, 0) << testing::PrintToString(lived);
+  const auto summary = lastLine(lived);
+  EXPECT_GT(summary["rowsInserted"].get<int>(), 100);
+  const fs::path again = directory.path() / "again";
+  const auto replayed = runTool({"replay", "--chipset", "ice", "--documents", again.string(), recording.string()});
+  EXPECT_EQ(replayed.exitCode, 0) << testing::PrintToString(replayed);
+  EXPECT_EQ(lastLine(replayed)["events"], summary["events"]);
+  constexpr char kRows[] =
+      "SELECT Id || '|' || metric_name || '|' || attribute_name || '|' || attribute_value || '|' || collected_on FROM "
+      "Metric ORDER BY Id";
+  EXPECT_TRUE(rowsOf(again / "metricPartV11.sqlite", kRows) == rowsOf(database, kRows));
+}
+
+TEST_F(Simulate, MakesAHistoryThatTheProductFindsAndKeeps) {
+  const auto made = simulate({"--documents", documents.string(), "--history-days", "2"});
+  EXPECT_EQ(made.exitCode, 0) << testing::PrintToString(made);
+  EXPECT_EQ(made.errors, "");
+  const auto summary = lastLine(made);
+  const auto rows = summary["rows"].get<std::uint64_t>();
+  EXPECT_GT(rows, 1000U);
+  EXPECT_EQ(rowsOf(database, "SELECT count(*) FROM Metric"), std::vector{std::to_string(rows)});
+  const auto listed = runTool({"metrics", "--documents", documents.string()});
+  EXPECT_EQ(listed.exitCode, 0);
+  EXPECT_NE(listed.output.find("Nr ConnectionStats"), std::string::npos);
+  EXPECT_EQ(rowsOf(database, "SELECT count(*) FROM Metric"), std::vector{std::to_string(rows)});
+}
+
+TEST_F(Simulate, TellsWhatCannotBeWritten) {
+  const auto noFolder = simulate({"--minutes", "1", "--output", "/no/such/folder/way.jsonl"});
+  EXPECT_EQ(noFolder.exitCode, 1);
+  EXPECT_EQ(noFolder.errors, "quorl-tool: /no/such/folder/way.jsonl: No such file or directory\n");
+  const auto fullDisk = simulate({"--minutes", "5", "--output", "/dev/full"});
+  EXPECT_EQ(fullDisk.exitCode, 1);
+  EXPECT_EQ(fullDisk.errors, "quorl-tool: /dev/full: No space left on device\n");
+  writeFile(directory.path() / "file", "x");
+  const auto noDocuments = simulate({"--documents", (directory.path() / "file").string(), "--history-days", "1"});
+  EXPECT_EQ(noDocuments.exitCode, 1);
+  EXPECT_NE(noDocuments.errors.find("file"), std::string::npos);
+}
+
+TEST_F(Simulate, TellsWhatIsWrongWithAScenario) {
+  EXPECT_EQ(runTool({"simulate", "--scenario", "moon", "--output", recording.string()}).exitCode, 1);
+  const fs::path scenario = directory.path() / "wrong.scenario";
+  writeFile(scenario, "nonsense here\n");
+  const auto result = runTool({"simulate", "--scenario", scenario.string(), "--output", recording.string()});
+  EXPECT_EQ(result.exitCode, 1);
+  EXPECT_NE(result.errors.find("wrong.scenario:1: "), std::string::npos) << result.errors;
+  EXPECT_FALSE(fs::exists(recording));
+}
+
+TEST_F(Simulate, RefusesOptionsThatDoNotFitTogether) {
+  EXPECT_EQ(simulate({}).exitCode, 2);
+  EXPECT_EQ(simulate({"--output", recording.string(), "--documents", documents.string()}).exitCode, 2);
+  EXPECT_EQ(simulate({"--output", recording.string(), "--history-days", "3"}).exitCode, 2);
+  EXPECT_EQ(simulate({"--output", recording.string(), "--speed", "3"}).exitCode, 2);
+  EXPECT_EQ(simulate({"--documents", documents.string(), "--start", "2026-01-05 09:30:00"}).exitCode, 2);
+  EXPECT_EQ(simulate({"--output", recording.string(), "--start", "yesterday"}).exitCode, 1);
+  EXPECT_EQ(simulate({"--output", recording.string(), "--family", "neither"}).exitCode, 2);
+  EXPECT_FALSE(fs::exists(documents));
+}
+
+TEST(ProgressText, GrowsWithTheShare) {
+  EXPECT_EQ(tool::progressText(0, "rows"), "[>                             ]   0 % rows");
+  EXPECT_EQ(tool::progressText(0.5, "rows"), "[===============>              ]  50 % rows");
+  EXPECT_EQ(tool::progressText(1, "rows"), "[==============================] 100 % rows");
+  EXPECT_EQ(tool::progressText(7, "rows"), tool::progressText(1, "rows"));
+  EXPECT_EQ(tool::progressText(-1, "rows"), tool::progressText(0, "rows"));
+  EXPECT_EQ(tool::progressText(0.0 / 0.0, "rows"), tool::progressText(0, "rows"));
+}
+
+}  // namespace
+}  // namespace quorl::test

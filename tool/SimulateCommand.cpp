@@ -1,0 +1,164 @@
+#include <chrono>
+#include <cmath>
+#include <cstdint>
+#include <filesystem>
+#include <iostream>
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <fmt/format.h>
+
+#include "Commands.h"
+#include "Documents.h"
+#include "MessageJson.h"
+#include "ProgressBar.h"
+#include "Simulation.h"
+#include "base/DateText.h"
+#include "hosts/simulator/PhoneServices.h"
+#include "hosts/simulator/ScenarioFiles.h"
+
+namespace quorl::tool {
+namespace {
+
+using simulator::ScenarioChoice;
+
+struct Options {
+  std::string scenario;
+  std::string family = "mav";
+  std::string output;
+  std::string documents;
+  std::string record;
+  std::string start;
+  std::uint64_t seed = 1;
+  double minutes = 10;
+  double speed = 0;  // 0: as fast as possible
+  int historyDays = 0;
+  bool hasMinutes = false;
+};
+
+/// Why the options do not fit together; empty if they do.
+std::string contradiction(const Options& options) {
+  if (options.output.empty() == options.documents.empty()) return "one of --output and --documents is needed";
+  if (!options.output.empty() && options.historyDays > 0) return "--history-days needs --documents";
+  if (!options.output.empty() && !options.record.empty()) return "--record needs --documents; --output is a recording";
+  if (!options.output.empty() && options.speed > 0) return "--speed needs --documents";
+  if (!options.documents.empty() && !options.start.empty()) return "--start needs --output; --documents ends now";
+  return {};
+}
+
+std::optional<Date> startOf(const Options& options) {
+  constexpr std::chrono::seconds kUsual{1767605400};  // 2026-01-05 09:30:00 UTC
+  return options.start.empty() ? Date(kUsual) : parseWallClock(options.start);
+}
+
+std::chrono::milliseconds lengthOf(const Options& options) {
+  return std::chrono::milliseconds(std::llround(options.minutes * 60000));
+}
+
+int fail(std::string_view text) {
+  complain(text);
+  return kFailure;
+}
+
+double rounded(double value) {
+  return std::round(value * 1000) / 1000;
+}
+
+int writeRecording(const Options& options, ScenarioChoice choice) {
+  const auto start = startOf(options);
+  if (!start) return fail(fmt::format("{} is no time of the form yyyy-MM-dd HH:mm:ss", options.start));
+  ProgressBar bar;
+  const auto written = recordScenario(std::move(choice), *start, lengthOf(options), options.output,
+                                      [&bar](double share) { bar.show(share, "of the way"); });
+  if (!written) return fail(fmt::format("{}: {}", options.output, written.error()));
+  std::cout << jsonLine({{"events", written->events}, {"seconds", rounded(written->seconds)}}) << '\n';
+  return kSuccess;
+}
+
+int fillDocuments(const Options& options, const ScenarioChoice& choice) {
+  if (const auto prepared = prepareDocuments(options.documents); !prepared) return fail(prepared.error());
+  const Date until = SystemClock().now();
+  SimulatedProduct product(options.family, options.documents);
+  if (options.historyDays > 0) {
+    ProgressBar bar;
+    const auto made = product.makeHistory({choice, options.historyDays, until}, [&bar](const auto& so) {
+      bar.show(static_cast<double>(so.sessionsDone) / so.sessions, fmt::format("{} rows", so.rows));
+    });
+    if (!made) return fail(made.error());
+    std::cout << jsonLine({{"sessions", made->sessions},
+                           {"events", made->events},
+                           {"rows", made->rows},
+                           {"seconds", rounded(made->seconds)},
+                           {"rowsPerSecond", std::round(static_cast<double>(made->rows) / made->seconds)}})
+              << '\n';
+    if (!options.hasMinutes) return kSuccess;
+  }
+  const std::optional<std::filesystem::path> recording =
+      options.record.empty() ? std::nullopt : std::optional<std::filesystem::path>(options.record);
+  ProgressBar bar;
+  const auto lived =
+      product.live({choice, options.speed > 0 ? options.speed : 1, recording}, lengthOf(options),
+                   /*isPaced=*/options.speed > 0, [&bar](double share) { bar.show(share, "of the way"); });
+  if (!lived) return fail(lived.error());
+  std::cout << jsonLine({{"events", lived->events},
+                         {"rowsInserted", lived->rows},
+                         {"insertsFailed", lived->insertsFailed},
+                         {"seconds", rounded(lived->seconds)}})
+            << '\n';
+  const auto folded = foldWriteAheadLog(options.documents);
+  if (!folded) return fail(folded.error());
+  return lived->insertsFailed == 0 ? kSuccess : kFailure;
+}
+
+int simulate(const Options& options) {
+  if (const std::string why = contradiction(options); !why.empty()) {
+    complain(why + " (see quorl-tool simulate --help)");
+    return kWrongUse;
+  }
+  const auto resources = simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY);
+  auto scenario = simulator::findScenario(options.scenario, resources);
+  if (!scenario) {
+    for (const std::string& problem : scenario.error()) complain(problem);
+    return kFailure;
+  }
+  ScenarioChoice choice{*std::move(scenario), options.seed,
+                        options.family == "ice" ? simulator::metrics::Family::Ice : simulator::metrics::Family::Mav};
+  if (!options.output.empty()) return writeRecording(options, std::move(choice));
+  return fillDocuments(options, choice);
+}
+
+}  // namespace
+
+void addSimulate(CLI::App& tool, Action& chosen) {
+  auto* command = tool.add_subcommand("simulate", "Send a simulated phone through a scenario");
+  command->footer(
+      "Writes what its baseband manager delivers as a recording, or fills a database: with --history-days a past in\n"
+      "which the product was looked at some times a day, written in bulk; with --minutes what the product itself "
+      "makes\n"
+      "of the way. The same scenario, seed and family give the same recording, byte for byte.");
+  auto options = std::make_shared<Options>();
+  command->add_option("--scenario", options->scenario, "Name of a scenario that ships with it, or a file")->required();
+  command->add_option("--seed", options->seed, "Which of the scenario's runs")->capture_default_str();
+  command->add_option("--family", options->family, "Baseband family")
+      ->check(CLI::IsMember({"mav", "ice"}))
+      ->capture_default_str();
+  auto* minutes = command->add_option("--minutes", options->minutes, "Simulated minutes")
+                      ->check(CLI::Range(0.0, 60.0 * 24 * 31))
+                      ->capture_default_str();
+  command->add_option("--output", options->output, "Recording to write");
+  command->add_option("--start", options->start, "Wall-clock time at which a recording begins, yyyy-MM-dd HH:mm:ss");
+  command->add_option("--documents", options->documents, "Directory for a database; made if it is missing");
+  command->add_option("--history-days", options->historyDays, "Days of history before now")->check(CLI::Range(1, 31));
+  command->add_option("--speed", options->speed, "Simulated seconds in a second; as fast as possible without it")
+      ->check(CLI::Range(0.001, 100000.0));
+  command->add_option("--record", options->record, "Recording of what the product was delivered");
+  command->callback([&chosen, options, minutes] {
+    options->hasMinutes = minutes->count() > 0;
+    chosen = [options] { return simulate(*options); };
+  });
+}
+
+}  // namespace quorl::tool
