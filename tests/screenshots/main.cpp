@@ -18,6 +18,7 @@
 #include "hosts/simulator/TelephonyScript.h"
 #include "shell/view/Appearance.h"
 #include "support/TimeZone.h"
+#include "support/VirtualTimeVfs.h"
 #include "support/window/WindowFixture.h"
 
 namespace quorl::test {
@@ -31,6 +32,12 @@ struct Look {
   const char* name;
   QSize size;
   bool isDark;
+};
+
+/// The time of a phone that is yet to be made: the database's file system has to be there before and after it.
+struct PhoneClock final : Clock {
+  Date now() const override { return clock->now(); }
+  const Clock* clock = nullptr;
 };
 
 class Photographer : public WindowPhone {
@@ -130,6 +137,15 @@ class Photographer : public WindowPhone {
   const std::vector<simulator::RecordedEvent>& events_;
 };
 
+void photographOn(const std::filesystem::path& folder, const Look& look,
+                  const std::vector<simulator::RecordedEvent>& events, void (Photographer::*photograph)()) {
+  PhoneClock clock;
+  const VirtualTimeVfs files(clock);
+  Photographer photographer(folder, look, events);
+  clock.clock = &photographer.phone.time;
+  (photographer.*photograph)();
+}
+
 int photograph(const std::filesystem::path& folder) {
   std::filesystem::create_directories(folder);
   const ScopedTimeZone zone("UTC");
@@ -138,8 +154,8 @@ int photograph(const std::filesystem::path& folder) {
   if (!recording) throw std::runtime_error(recording.error());
   for (const bool isDark : {false, true}) {
     for (const Look look : {Look{"phone", {390, 844}, isDark}, Look{"tablet", {1024, 768}, isDark}})
-      Photographer(folder, look, recording->events).photographAll();
-    Photographer(folder, {"phone", {390, 844}, isDark}, recording->events).photographUnknownChipset();
+      photographOn(folder, look, recording->events, &Photographer::photographAll);
+    photographOn(folder, {"phone", {390, 844}, isDark}, recording->events, &Photographer::photographUnknownChipset);
   }
   return EXIT_SUCCESS;
 }
