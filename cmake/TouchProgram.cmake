@@ -10,9 +10,12 @@ function(quorl_warn_in)
   set_source_files_properties(${ARGN} PROPERTIES COMPILE_OPTIONS "${own_code_flags}")
 endfunction()
 
-file(GLOB_RECURSE view_sources CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*/view/*.cpp)
-file(GLOB_RECURSE view_headers CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*/view/*.h)
-file(GLOB_RECURSE view_qml CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*/view/*.qml)
+file(GLOB view_sources CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*/view/*.cpp
+     ${CMAKE_CURRENT_SOURCE_DIR}/screens/*/view/*.cpp)
+file(GLOB view_headers CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*/view/*.h
+     ${CMAKE_CURRENT_SOURCE_DIR}/screens/*/view/*.h)
+file(GLOB view_qml CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*/view/*.qml
+     ${CMAKE_CURRENT_SOURCE_DIR}/screens/*/view/*.qml)
 quorl_warn_in(${view_sources})
 
 set(view_folders)

@@ -6,6 +6,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace quorl {
 
@@ -76,12 +77,34 @@ class AnalyticsSink {
   virtual void send(std::string_view event, const Payload& payload) = 0;
 };
 
+/// One text for the user to take away. It is made piece by piece each time it is asked for, as it may be too large to
+/// be held whole.
+class SharedText {
+ public:
+  /// Takes a piece, which is valid during the call. False ends the text there.
+  using Sink = std::function<bool(std::string_view piece)>;
+  /// Gives the pieces to a sink, in their order, until it answers false. Any thread, any number of times.
+  using Writer = std::function<void(const Sink& sink)>;
+
+  SharedText(std::string fileName, Writer writer) : fileName_(std::move(fileName)), writer_(std::move(writer)) {}
+
+  /// What a file of it is called unless the user says otherwise: a name without a folder.
+  const std::string& fileName() const { return fileName_; }
+  void write(const Sink& sink) const { writer_(sink); }
+  /// All of it.
+  std::string text() const;
+
+ private:
+  std::string fileName_;
+  Writer writer_;
+};
+
 /// Hands one text to the user, whatever the user then does with it.
 class ShareFacility {
  public:
   virtual ~ShareFacility() = default;
   /// Main thread.
-  virtual void share(std::string text) = 0;
+  virtual void share(SharedText text) = 0;
 };
 
 class Pasteboard {

@@ -163,6 +163,36 @@ TEST_F(ExportTest, ATapShowsThatItGathersAndThenSharesOneText) {
   EXPECT_THAT(shared(), HasSubstr("attributeValue: 11, attributeValueType: , "));
 }
 
+TEST_F(ExportTest, TheTextIsCalledByTimeFrameAndTime) {
+  launch();
+  platform.time.setNow(Date(std::chrono::seconds(1767605412)));
+  open();
+  EXPECT_EQ(row("Daily").fileName(), "quorl-daily-2026-01-05-093012.txt");
+  EXPECT_EQ(row("Monthly").fileName(), "quorl-monthly-2026-01-05-093012.txt");
+  taps("Weekly");
+  pass(1h);
+  EXPECT_THAT(platform.share.fileNames, ElementsAre("quorl-weekly-2026-01-05-093012.txt"));  // of the tap
+}
+
+TEST_F(ExportTest, ATextOfManyPiecesIsTheSameAsAWhole) {
+  ExportedMetrics metrics;
+  const Metric row = exampleRow();
+  for (int i = 0; i < 1000; ++i)
+    metrics.append({Uuid::make(), row.metricTech, row.metricName, row.attributeName, row.attributeNameNonLocalized,
+                    std::to_string(i), row.collectedOn, row.metricId, row.subsId},
+                   platform.strings);
+  const SharedText shared = sharedExportText(metrics, "name.txt");
+  EXPECT_EQ(shared.text(), exportText(metrics));
+  EXPECT_EQ(shared.text(), exportText(metrics));  // it can be made again
+  std::size_t pieces = 0;
+  shared.write([&](std::string_view piece) {
+    EXPECT_LT(piece.size(), 128U * 1024);
+    return ++pieces < 2;
+  });
+  EXPECT_EQ(pieces, 2U);  // and ends when it is told to
+  EXPECT_EQ(sharedExportText(ExportedMetrics(), "name.txt").text(), "");
+}
+
 TEST_F(ExportTest, EachRowTakesItsOwnTimeFrame) {
   launch();
   stored(power("1"));

@@ -165,6 +165,49 @@ TEST_F(MetricDetailScreenTest, ANewReadingGetsANewCell) {
   EXPECT_TRUE(log.has(line("metricDetail", "MetricDetailViewModel - updateDashboardItem - unable to unwrap metric")));
 }
 
+TEST_F(MetricDetailScreenTest, ANewReadingKeepsTheBookmarkOnShowUntilItIsMarkedItself) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  open("LTE", "Tx Power");
+  cell(0).tapBookmark();
+  settle();
+  bool hasFlickered = false;
+  const Connection connection =
+      screen->view().onChange([&] { hasFlickered = hasFlickered || !cell(0).isBookmarked(); });
+  pass(1s);
+  arrives(reading("LTE", "Tx Power", "power", "12"));
+  EXPECT_EQ(cell(0).valueText(), "12");
+  EXPECT_TRUE(cell(0).isBookmarked());
+  EXPECT_FALSE(hasFlickered);
+  // Unpinned elsewhere meanwhile.
+  sql("DELETE FROM Dashboard");
+  pass(1s);
+  arrives(reading("LTE", "Tx Power", "power", "13"));
+  EXPECT_FALSE(cell(0).isBookmarked());
+}
+
+TEST_F(MetricDetailScreenTest, ATapOnTheBookmarkOfAReadingThatIsNotMarkedYetUnpins) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  open("LTE", "Tx Power");
+  cell(0).tapBookmark();
+  settle();
+  pass(1s);
+  const Metric next = reading("LTE", "Tx Power", "power", "12");
+  stored(next);
+  bool hasTapped = false;
+  const Connection connection = screen->view().onChange([&] {
+    if (hasTapped || cell(0).valueText() != "12") return;
+    hasTapped = true;
+    cell(0).tapBookmark();
+  });
+  announced(next);
+  settle();
+  EXPECT_TRUE(hasTapped);
+  EXPECT_FALSE(cell(0).isBookmarked());
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard"), 0);
+}
+
 // Graphs.
 
 TEST_F(MetricDetailScreenTest, OnlyBuildsForEngineersAndCarriersShowTheGraphSymbol) {

@@ -179,8 +179,8 @@ TEST(PrintedAlerts, PrintTheDialogAndPressItsButtonLater) {
 TEST(KeptShare, KeepsTheTextThatWasSharedLast) {
   KeptShare share;
   EXPECT_EQ(share.text(), std::nullopt);
-  share.share("one");
-  share.share("two");
+  share.share({"", [](const SharedText::Sink& sink) { sink("one"); }});
+  share.share({"", [](const SharedText::Sink& sink) { sink("two"); }});
   EXPECT_EQ(share.text(), "two");
   KeptPasteboard pasteboard;
   pasteboard.setText("three");

@@ -60,8 +60,12 @@ struct FakeAnalytics final : AnalyticsSink {
 };
 
 struct FakeShare final : ShareFacility {
-  void share(std::string text) override { texts.push_back(std::move(text)); }
+  void share(SharedText text) override {
+    fileNames.push_back(text.fileName());
+    texts.push_back(text.text());
+  }
   std::vector<std::string> texts;
+  std::vector<std::string> fileNames;
 };
 
 struct FakePasteboard final : Pasteboard {

@@ -95,7 +95,7 @@ class LoggedAnalytics final : public AnalyticsSink {
 /// Keeps the text that was shared last, for the host to do something with it.
 class KeptShare final : public ShareFacility {
  public:
-  void share(std::string text) override { text_ = std::move(text); }
+  void share(SharedText text) override { text_ = text.text(); }
   /// Nothing if nothing was shared yet.
   const std::optional<std::string>& text() const { return text_; }
 

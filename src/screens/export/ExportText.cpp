@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <optional>
 #include <string_view>
+#include <utility>
 
 #include "base/DateText.h"
 
@@ -14,6 +15,8 @@ namespace {
 
 /// All that is not the rows' own texts: field names, separators, id, time, flags and a number.
 constexpr std::size_t kFixedSize = 352;
+/// Of a piece of the text.
+constexpr std::size_t kPieceSize = 64 * 1024;
 
 void appendTwoDigits(char*& at, std::int64_t value) {
   *at++ = static_cast<char>('0' + value / 10);
@@ -126,6 +129,21 @@ std::string exportText(const ExportedMetrics& metrics) {
     append(text, metrics.row(i), {}, times);
   }
   return text;
+}
+
+SharedText sharedExportText(ExportedMetrics metrics, std::string fileName) {
+  return {std::move(fileName), [metrics = std::move(metrics)](const SharedText::Sink& sink) {
+            std::string piece;
+            UtcTextWriter times;
+            for (std::size_t i = 0; i < metrics.size(); ++i) {
+              if (i > 0) piece.push_back(',');
+              append(piece, metrics.row(i), {}, times);
+              if (piece.size() < kPieceSize) continue;
+              if (!sink(piece)) return;
+              piece.clear();
+            }
+            if (!piece.empty()) sink(piece);
+          }};
 }
 
 }  // namespace quorl

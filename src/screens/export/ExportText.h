@@ -13,4 +13,7 @@ void appendMetricText(std::string& text, const Metric& metric);
 /// The prints of all records, in their order, with a comma between two and nothing else. Any thread.
 std::string exportText(const ExportedMetrics& metrics);
 
+/// The same text in pieces of some ten thousand bytes.
+SharedText sharedExportText(ExportedMetrics metrics, std::string fileName);
+
 }  // namespace quorl

@@ -3,6 +3,7 @@
 #include <optional>
 #include <utility>
 
+#include "base/DateText.h"
 #include "base/FatalStop.h"
 #include "base/Log.h"
 #include "platform/Platform.h"
@@ -32,6 +33,13 @@ const char* labelOf(AttributeDetailTimeFrame timeFrame) {
 ExportView::ExportView(AttributeDetailTimeFrame timeFrame, std::weak_ptr<ExportViewDelegate> delegate)
     : timeFrame_(timeFrame), labelText_(labelOf(timeFrame)), delegate_(std::move(delegate)) {}
 
+std::string ExportView::fileName() const {
+  std::string name = "quorl-" + labelText_ + "-" + wallClockText(Platform::current().clock.now()) + ".txt";
+  std::erase(name, ':');
+  for (char& c : name) c = c == ' ' ? '-' : c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+  return name;
+}
+
 void ExportView::didTapExportButton() {
   generalLog.log("Export View - didTapExportButton");
   const auto screen = delegate_.lock();
@@ -39,7 +47,8 @@ void ExportView::didTapExportButton() {
   screen->loadingView().setLoadingLabelText("Gathering metrics from database");
   screen->loadingView().show();
   screen->persistanceStore()->exportMetrics(
-      timeFrame_, [delegate = delegate_](const ExportedMetrics& metrics, const std::optional<SQLiteError>& error) {
+      timeFrame_, [delegate = delegate_, fileName = fileName()](const ExportedMetrics& metrics,
+                                                                const std::optional<SQLiteError>& error) {
         if (error) {
           generalLog.log("error  ---> %{public}s)", *error);  // the bracket is part of the line
           return;
@@ -47,7 +56,7 @@ void ExportView::didTapExportButton() {
         const auto alive = delegate.lock();
         if (!alive) return;
         alive->loadingView().hide();
-        Platform::current().share.share(exportText(metrics));
+        Platform::current().share.share(sharedExportText(metrics, fileName));
       });
 }
 

@@ -27,7 +27,10 @@ class ExportView {
   const std::string& labelText() const { return labelText_; }
   AttributeDetailTimeFrame timeFrame() const { return timeFrame_; }
 
-  /// Gathers all rows of the time frame and hands them to the share facility as one text, made on the main thread.
+  /// What a file of the text is called at this moment: "quorl-daily-2026-01-05-093012.txt".
+  std::string fileName() const;
+
+  /// Gathers all rows of the time frame and hands them to the share facility as one text, which is made as it is taken.
   /// After a failed read the loading view stays.
   void didTapExportButton();
 

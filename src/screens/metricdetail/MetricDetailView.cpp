@@ -19,9 +19,13 @@ std::string MetricDetailView::lastSeenText() const {
 }
 
 void MetricDetailView::refresh() {
-  CellsById earlier;
-  for (const Section& section : sections_)
-    for (const auto& cell : section.cells) earlier.emplace(cell->metricObject().id, cell);
+  Earlier earlier;
+  for (const Section& section : sections_) {
+    for (const auto& cell : section.cells) {
+      earlier.byId.emplace(cell->metricObject().id, cell);
+      earlier.byName.emplace(std::pair(section.header, cell->metricObject().attributeNameNonLocalized), cell);
+    }
+  }
   sections_.clear();
   for (const MetricSectional& sectional : viewModel_->metricSectionals())
     sections_.push_back(makeSection("CA Status " + sectional.sectionName, sectional.sectionMetrics,
@@ -31,30 +35,43 @@ void MetricDetailView::refresh() {
   changed_();
 }
 
+void MetricDetailView::refreshBookmarks() {
+  refresh();
+  for (const Section& section : sections_)
+    for (const auto& cell : section.cells) cell->mark();
+  changed_();
+}
+
 MetricDetailView::Section MetricDetailView::makeSection(std::string header, const std::vector<Metric>& rows,
-                                                        bool isSectioned, const CellsById& earlier) {
+                                                        bool isSectioned, const Earlier& earlier) {
   Section section{std::move(header), {}};
   section.cells.reserve(rows.size());
   for (const Metric& row : rows) {
-    const auto found = earlier.find(row.id);
-    section.cells.push_back(found == earlier.end() ? makeCell(row, isSectioned) : found->second);
-    section.cells.back()->update(row);
+    if (const auto same = earlier.byId.find(row.id); same != earlier.byId.end()) {
+      section.cells.push_back(same->second);
+      same->second->update(row);
+      continue;
+    }
+    const auto before = earlier.byName.find({section.header, row.attributeNameNonLocalized});
+    const bool isBookmarked = before == earlier.byName.end() ? row.isBookmarked : before->second->isBookmarked();
+    section.cells.push_back(makeCell(row, isBookmarked, isSectioned));
   }
   return section;
 }
 
-std::shared_ptr<MetricDetailsViewCell> MetricDetailView::makeCell(const Metric& row, bool isSectioned) {
+std::shared_ptr<MetricDetailsViewCell> MetricDetailView::makeCell(const Metric& row, bool isBookmarked,
+                                                                  bool isSectioned) {
   MetricDetailsViewCell::Actions actions;
   actions.graphableAction = [this, id = row.id, isSectioned] {
     const Place place = placeOf(id, isSectioned);
     viewProtocol_.showGraphForItemAt(*viewModel_, place.index, place.sectionIndex, isSectioned);
   };
-  actions.bookMarkAction = [this, id = row.id, isSectioned](bool isBookmarked) {
+  actions.bookMarkAction = [this, id = row.id, isSectioned](bool isPinned) {
     const Place place = placeOf(id, isSectioned);
-    viewModel_->updateDashboardItem(place.index, isBookmarked, place.sectionIndex, isSectioned);
+    viewModel_->updateDashboardItem(place.index, isPinned, place.sectionIndex, isSectioned);
   };
   actions.onCopyAction = [this] { showToast_.show(); };
-  return std::make_shared<MetricDetailsViewCell>(row, std::move(actions));
+  return std::make_shared<MetricDetailsViewCell>(row, isBookmarked, std::move(actions));
 }
 
 MetricDetailView::Place MetricDetailView::placeOf(const Uuid& id, bool isSectioned) const {

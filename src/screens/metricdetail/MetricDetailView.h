@@ -4,6 +4,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "base/Signal.h"
@@ -41,16 +42,22 @@ class MetricDetailView {
   Toast& showToast() { return showToast_; }
 
   /// Takes the model's state on show. A row that is still the same reading keeps its cell, and so what the user has
-  /// flipped in it.
+  /// flipped in it; a new reading of an attribute starts with the bookmark that the one before shows.
   void refresh();
+  /// The same with the bookmarks, which the model has marked now.
+  void refreshBookmarks();
   /// `handler` runs after every change of a text, of the rows or of the spinner.
   [[nodiscard]] Connection onChange(Signal<>::Handler handler) { return changed_.connect(std::move(handler)); }
 
  private:
-  using CellsById = std::map<Uuid, std::shared_ptr<MetricDetailsViewCell>>;
+  /// Cells shown before: by reading, and by attribute (header and raw name).
+  struct Earlier {
+    std::map<Uuid, std::shared_ptr<MetricDetailsViewCell>> byId;
+    std::map<std::pair<std::string, std::string>, std::shared_ptr<MetricDetailsViewCell>> byName;
+  };
 
-  Section makeSection(std::string header, const std::vector<Metric>& rows, bool isSectioned, const CellsById& earlier);
-  std::shared_ptr<MetricDetailsViewCell> makeCell(const Metric& row, bool isSectioned);
+  Section makeSection(std::string header, const std::vector<Metric>& rows, bool isSectioned, const Earlier& earlier);
+  std::shared_ptr<MetricDetailsViewCell> makeCell(const Metric& row, bool isBookmarked, bool isSectioned);
   /// Where a row stands in the model now. An index that no row has when it is gone.
   struct Place {
     std::size_t index;

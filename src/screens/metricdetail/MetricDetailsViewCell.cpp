@@ -15,8 +15,8 @@ constexpr Logger appUiLog{log_category::kAppUi};
 
 }  // namespace
 
-MetricDetailsViewCell::MetricDetailsViewCell(Metric metricObject, Actions actions)
-    : metricObject_(std::move(metricObject)), actions_(std::move(actions)), isBookmarked_(metricObject_.isBookmarked) {}
+MetricDetailsViewCell::MetricDetailsViewCell(Metric metricObject, bool isBookmarked, Actions actions)
+    : metricObject_(std::move(metricObject)), actions_(std::move(actions)), isBookmarked_(isBookmarked) {}
 
 std::string MetricDetailsViewCell::nameText() const {
   if (metricObject_.attributeName.find("section-") == std::string::npos) return metricObject_.attributeName;
@@ -51,7 +51,11 @@ void MetricDetailsViewCell::longPress() {
 
 void MetricDetailsViewCell::update(const Metric& metric) {
   metricObject_ = metric;
-  if (!isFlippedByUser_ && metric.isBookmarked != isBookmarked_.get()) isBookmarked_.set(metric.isBookmarked);
+}
+
+void MetricDetailsViewCell::mark() {
+  if (!isFlippedByUser_ && metricObject_.isBookmarked != isBookmarked_.get())
+    isBookmarked_.set(metricObject_.isBookmarked);
 }
 
 }  // namespace quorl

@@ -18,7 +18,8 @@ class MetricDetailsViewCell {
     std::function<void()> onCopyAction;
   };
 
-  MetricDetailsViewCell(Metric metricObject, Actions actions);
+  /// `isBookmarked` holds until the reading's own bookmark is known.
+  MetricDetailsViewCell(Metric metricObject, bool isBookmarked, Actions actions);
   MetricDetailsViewCell(const MetricDetailsViewCell&) = delete;
   MetricDetailsViewCell& operator=(const MetricDetailsViewCell&) = delete;
 
@@ -40,8 +41,10 @@ class MetricDetailsViewCell {
   /// Copies the value shown to the pasteboard.
   void longPress();
 
-  /// Takes over what has become of the same reading, but not its bookmark once the user has flipped it here.
+  /// Takes over what has become of the same reading, but for its bookmark.
   void update(const Metric& metric);
+  /// Takes over the reading's bookmark, unless the user has flipped it here.
+  void mark();
   /// `handler` runs at once and whenever the bookmark flips.
   [[nodiscard]] Connection onBookmarkChange(Published<bool>::Handler handler) {
     return isBookmarked_.subscribe(std::move(handler));

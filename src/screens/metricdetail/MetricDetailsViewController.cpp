@@ -35,7 +35,7 @@ void MetricDetailsViewController::viewDidLoad() {
 }
 
 void MetricDetailsViewController::refresh() {
-  view_.refresh();
+  view_.refreshBookmarks();
 }
 
 void MetricDetailsViewController::openGraph(const Metric& metric) {

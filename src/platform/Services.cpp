@@ -1,0 +1,14 @@
+#include "platform/Services.h"
+
+namespace quorl {
+
+std::string SharedText::text() const {
+  std::string text;
+  write([&text](std::string_view piece) {
+    text.append(piece);
+    return true;
+  });
+  return text;
+}
+
+}  // namespace quorl

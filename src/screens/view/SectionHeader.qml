@@ -1,0 +1,36 @@
+import QtQuick
+import Quorl
+
+// The header over a section of a list, which sticks to the top.
+Rectangle {
+    id: root
+
+    property string text
+
+    implicitHeight: label.implicitHeight + 3 * Theme.grid
+    color: Theme.bar
+    Accessible.role: Accessible.StaticText
+    Accessible.name: text
+
+    Text {
+        id: label
+
+        anchors.left: parent.left
+        anchors.leftMargin: Theme.margin
+        anchors.right: parent.right
+        anchors.rightMargin: Theme.margin
+        anchors.verticalCenter: parent.verticalCenter
+        text: root.text
+        font.pixelSize: Theme.section
+        font.weight: Font.DemiBold
+        color: Theme.header
+        elide: Text.ElideMiddle
+        textFormat: Text.PlainText
+    }
+    Rectangle {
+        anchors.bottom: parent.bottom
+        width: parent.width
+        height: 1
+        color: Theme.line
+    }
+}
