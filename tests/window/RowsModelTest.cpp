@@ -31,8 +31,9 @@ class Model final : public RowsModel<Row> {
   QVariant data(const QModelIndex& index, int role) const override {
     const Row* found = row(index);
     if (found == nullptr) return {};
-    return role == Qt::UserRole ? QVariant(found->value)
-                                : role == Qt::DisplayRole ? QVariant(QString::fromStdString(found->name)) : QVariant();
+    return role == Qt::UserRole      ? QVariant(found->value)
+           : role == Qt::DisplayRole ? QVariant(QString::fromStdString(found->name))
+                                     : QVariant();
   }
 };
 

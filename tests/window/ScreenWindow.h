@@ -1,8 +1,7 @@
 #pragma once
 
-#include <QObject>
-#include <QQmlComponent>
-#include <QVariantMap>
+#include <QString>
+#include <chrono>
 #include <memory>
 #include <string>
 #include <vector>
@@ -14,27 +13,79 @@
 #include "support/TimeZone.h"
 #include "support/window/WindowFixture.h"
 
+struct sqlite3;
+
 namespace quorl::test {
 
-/// A phone in UTC and American English whose screens are looked at, with rows that arrive as from the channel.
+/// The product in its window on a phone in UTC and American English, with rows of an earlier run and rows that arrive.
+/// The clock starts with the machine's, as SQLite works out limits by that.
 class ScreenWindowTest : public WindowTest {
  protected:
   ScreenWindowTest();
+  ~ScreenWindowTest() override;
 
-  PersistanceStore& store();
   /// A reading taken now.
   Metric reading(std::string metricTech, std::string metricName, std::string attributeName, std::string value,
                  std::int32_t subsId = 0) const;
-  /// Writes a row.
-  void stored(const Metric& metric);
-  /// The same, and announces it.
-  void arrives(const Metric& metric);
 
-  /// Saves what the window shows to a file of that name, where a folder for pictures is given.
-  void picture(const std::string& name);
+  // The file as an earlier run has left it. To be told before the launch.
+  void hasStored(const Metric& metric);
+  void hasPinned(const Metric& metric);
+  /// Two readings on the dashboard, the fewest that count.
+  void hasADashboard();
+
+  // The fixture's verbs, after each of which the window is drawn, as lists make their rows only then.
+  void launch() { drawn([this] { WindowTest::launch(); }); }
+  void settle() { drawn([this] { WindowTest::settle(); }); }
+  void pass(std::chrono::milliseconds duration) { drawn([&] { WindowTest::pass(duration); }); }
+  void tap(const QString& objectName) { tap(find(objectName)); }
+  void tap(QQuickItem* item) { drawn([&] { WindowTest::tap(item); }); }
+  void longPress(QQuickItem* item) { drawn([&] { WindowTest::longPress(item); }); }
+  void swipe(QQuickItem* item, int dx, int dy) { drawn([&] { WindowTest::swipe(item, dx, dy); }); }
+  void key(Qt::Key key, Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
+    drawn([&] { WindowTest::key(key, modifiers); });
+  }
+
+  // What happens.
+  /// Writes a row, and announces it.
+  void arrives(const Metric& metric);
+  void showsAllMetrics();
+  void showsDashboard();
+  /// Opens a row of the metric list, which is on show.
+  void opens(const std::string& metricName);
+  /// Every statement that writes fails while the answer lives.
+  std::shared_ptr<sqlite3> lockDatabase();
+  SteppedQueue& databaseQueue();
+
+  // What is on show.
+  /// The row of that name and kind, or null.
+  QQuickItem* row(const QString& objectName, const std::string& name);
+  /// A property of all rows of a kind, from the top down and then from the left.
+  std::vector<std::string> column(const QString& objectName, const char* property);
+  QQuickItem* inRow(QQuickItem* row, const QString& objectName) { return find(objectName, row); }
+  QRectF place(const QQuickItem* item) const;
+  std::int64_t number(const std::string& query);
+
+  PersistanceStore& store();
+  void types(const QString& text);
+
+ private:
+  template <typename Verb>
+  void drawn(Verb&& verb) {
+    verb();
+    if (HasFatalFailure()) return;
+    window().grabWindow();
+    WindowTest::settle();
+  }
+  std::shared_ptr<sqlite3> openFile() const;
+  void sql(const std::string& text);
 
   ScopedTimeZone zone_{"UTC"};
   ScopedLocale locale_{"en_US"};
 };
+
+inline std::string value(QQuickItem* row) {
+  return row == nullptr ? "no row" : row->property("value").toString().toStdString();
+}
 
 }  // namespace quorl::test

@@ -100,6 +100,8 @@ T.AbstractButton {
         Rectangle {
             id: tint
 
+            objectName: "changeTint"
+
             anchors.fill: valueText
             anchors.margins: -Theme.grid
             radius: Theme.grid

@@ -14,10 +14,10 @@ Column {
     spacing: Theme.grid
     visible: isShown && !delay.running
 
-    Timer {
+    Delay {
         id: delay
 
-        interval: 300
+        duration: 300
         running: root.isShown
     }
 

@@ -44,8 +44,8 @@ Item {
                 Accessible.name: text
                 Accessible.selected: isCurrent
                 onClicked: root.selected(index)
-                Keys.onReturnPressed: click()
-                Keys.onEnterPressed: click()
+                Keys.onReturnPressed: clicked()
+                Keys.onEnterPressed: clicked()
 
                 contentItem: Text {
                     text: segment.text

@@ -32,6 +32,6 @@ T.AbstractButton {
         border.color: Theme.buttonSelected
     }
 
-    Keys.onReturnPressed: click()
-    Keys.onEnterPressed: click()
+    Keys.onReturnPressed: clicked()
+    Keys.onEnterPressed: clicked()
 }

@@ -39,6 +39,6 @@ T.AbstractButton {
         border.color: button.isFilled ? Theme.title : Theme.buttonSelected
     }
 
-    Keys.onReturnPressed: click()
-    Keys.onEnterPressed: click()
+    Keys.onReturnPressed: clicked()
+    Keys.onEnterPressed: clicked()
 }

@@ -3,6 +3,9 @@
 #include <utility>
 
 #include "capture/view/SondrelBinding.h"
+#include "screens/dashboard/view/DashboardBinding.h"
+#include "screens/export/view/ExportBinding.h"
+#include "screens/metriclist/view/AllMetricsBinding.h"
 #include "shell/BaseViewController.h"
 #include "shell/LargeTitle.h"
 #include "shell/Window.h"
@@ -26,7 +29,10 @@ ShellBinding::ShellBinding(Window& window, AlertsBinding& alerts, QObject* paren
       menuBar_(base_.menuBar()),
       carrierBar_(*base_.carrierBar()),
       screens_(static_cast<std::size_t>(menuBar_.count())),
-      changes_(base_.onChange([this] { emit changed(); })) {}
+      changes_(base_.onChange([this] { emit changed(); })),
+      exports_(base_.onPresentExport([this](std::shared_ptr<ExportViewController> screen) {
+        emit presentExport(new ExportBinding(std::move(screen), this));
+      })) {}
 
 ShellBinding::~ShellBinding() = default;
 
@@ -67,8 +73,16 @@ QObject* ShellBinding::screen(int index) {
 }
 
 QObject* ShellBinding::makeScreen(int index) {
-  if (index == BaseViewController::sondrelIndex) return new SondrelBinding(base_.sondrelViewController(), this);
-  return nullptr;
+  switch (index) {
+    case BaseViewController::dashobardIndex:
+      return new DashboardBinding(base_.dashboardViewController(), this);
+    case BaseViewController::allMetricsIndex:
+      return new AllMetricsBinding(base_.firstLevelViewController(), this);
+    case BaseViewController::sondrelIndex:
+      return new SondrelBinding(base_.sondrelViewController(), this);
+    default:
+      return nullptr;
+  }
 }
 
 void ShellBinding::exportTapped() {

@@ -13,6 +13,7 @@
 #include <fmt/ranges.h>
 
 #include "app/ApplicationLoop.h"
+#include "screens/export/view/SaveText.h"
 #include "shell/Window.h"
 #include "shell/view/Appearance.h"
 #include "shell/view/QmlModule.h"
@@ -94,7 +95,7 @@ WindowPhone::WindowPhone()
                 phone.console,
                 alerts_,
                 phone.analytics,
-                phone.share,
+                view::SaveText::shared(),
                 phone.pasteboard,
                 phone.zelkor,
                 telephony} {

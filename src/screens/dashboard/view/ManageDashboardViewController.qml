@@ -18,11 +18,6 @@ FocusScope {
         function onDismissed() { root.navigation.dismiss() }
     }
 
-    Rectangle {
-        anchors.fill: parent
-        color: Theme.background
-    }
-
     Item {
         id: bar
 
@@ -201,11 +196,11 @@ FocusScope {
                 stillThere.restart()
             }
             // A row that could not be deleted goes back to its place.
-            Timer {
+            Delay {
                 id: stillThere
 
-                interval: 1000
-                onTriggered: row.swipe.close()
+                duration: 1000
+                onFinished: row.swipe.close()
             }
             ListView.onRemove: stillThere.stop()
         }

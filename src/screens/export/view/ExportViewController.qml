@@ -18,11 +18,6 @@ FocusScope {
         function onDismissed() { root.navigation.dismiss() }
     }
 
-    Rectangle {
-        anchors.fill: parent
-        color: Theme.background
-    }
-
     SymbolButton {
         id: closeButton
 
@@ -79,8 +74,8 @@ FocusScope {
                 Accessible.role: Accessible.Button
                 Accessible.name: text
                 onClicked: root.binding.didTapExportButton(index)
-                Keys.onReturnPressed: click()
-                Keys.onEnterPressed: click()
+                Keys.onReturnPressed: clicked()
+                Keys.onEnterPressed: clicked()
 
                 background: Rectangle {
                     color: option.pressed ? Theme.pressed : "transparent"

@@ -81,10 +81,10 @@ FocusScope {
         isShowing: !root.binding.isLoaded && !spinnerDelay.running
         text: qsTr("Loading...")
 
-        Timer {
+        Delay {
             id: spinnerDelay
 
-            interval: 150
+            duration: 150
             running: true
         }
     }

@@ -123,8 +123,8 @@ FocusScope {
                 ListView.view.currentIndex = index
                 root.binding.tapBar(index)
             }
-            Keys.onReturnPressed: click()
-            Keys.onEnterPressed: click()
+            Keys.onReturnPressed: clicked()
+            Keys.onEnterPressed: clicked()
 
             Rectangle {
                 objectName: "barBody"

@@ -122,10 +122,10 @@ FocusScope {
         isShowing: root.binding.showsSpinner && !spinnerDelay.running
         text: root.binding.spinnerText
 
-        Timer {
+        Delay {
             id: spinnerDelay
 
-            interval: 150
+            duration: 150
             running: true
         }
     }

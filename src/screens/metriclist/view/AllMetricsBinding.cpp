@@ -11,15 +11,30 @@ AllMetricsBinding::AllMetricsBinding(std::shared_ptr<AllMetricsViewController> c
       controller_(std::move(controller)),
       filtered_(rows_),
       changeConnection_(controller_->onChange([this] { controllerDidChange(); })),
-      detailConnection_(controller_->onOpenDetail([this](std::shared_ptr<MetricDetailsViewController> detail) {
-        emit openDetail(new MetricDetailsBinding(std::move(detail), this));
-      })) {
+      detailConnection_(controller_->onOpenDetail(
+          [this](std::shared_ptr<MetricDetailsViewController> detail) { openDetailOf(std::move(detail)); })) {
   rows_.take(controller_->table());
 }
 
 void AllMetricsBinding::controllerDidChange() {
   rows_.take(controller_->table());
   emit changed();
+}
+
+void AllMetricsBinding::openDetailOf(std::shared_ptr<MetricDetailsViewController> detail) {
+  auto* binding = new MetricDetailsBinding(std::move(detail), this);
+  detail_ = binding;
+  connect(binding, &QObject::destroyed, this, [this](const QObject* gone) {
+    if (gone == detail_) setSelection({}, {});
+  });
+  setSelection(binding->tech(), binding->title());
+  emit openDetail(binding);
+}
+
+void AllMetricsBinding::setSelection(const QString& tech, const QString& name) {
+  selectedTech_ = tech;
+  selectedName_ = name;
+  emit selectionChanged();
 }
 
 void AllMetricsBinding::setFilterText(const QString& text) {
@@ -37,10 +52,6 @@ QString AllMetricsBinding::pullToRefreshHint() const {
   return toQt(AllMetricsViewController::pullToRefreshHint);
 }
 
-void AllMetricsBinding::viewWillAppear() {
-  controller_->viewWillAppear();
-}
-
 void AllMetricsBinding::pullToRefresh() {
   if (!controller_->isRefreshing()) controller_->pullToRefresh();
 }
@@ -48,10 +59,6 @@ void AllMetricsBinding::pullToRefresh() {
 void AllMetricsBinding::select(int index) {
   const QModelIndex source = filtered_.mapToSource(filtered_.index(index, 0));
   if (!source.isValid()) return;
-  const AllMetricsRow row = rows_.rows()[static_cast<std::size_t>(source.row())];
-  selectedTech_ = toQt(row.metricTech);
-  selectedName_ = toQt(row.metricName);
-  emit selectionChanged();
   // The controller counts by group.
   std::size_t place = static_cast<std::size_t>(source.row());
   for (std::size_t section = 0; section < controller_->table().size(); ++section) {

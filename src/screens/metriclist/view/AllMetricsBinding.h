@@ -36,11 +36,10 @@ class AllMetricsBinding final : public QObject {
   QString lastRefreshedText() const;
   bool isRefreshing() const { return controller_->isRefreshing(); }
   QString pullToRefreshHint() const;
-  /// The metric that was opened last; empty before.
+  /// The metric whose detail is open; empty when none is.
   QString selectedTech() const { return selectedTech_; }
   QString selectedName() const { return selectedName_; }
 
-  Q_INVOKABLE void viewWillAppear();
   Q_INVOKABLE void pullToRefresh();
   /// Opens row `index` of `rows`.
   Q_INVOKABLE void select(int index);
@@ -54,6 +53,8 @@ class AllMetricsBinding final : public QObject {
 
  private:
   void controllerDidChange();
+  void openDetailOf(std::shared_ptr<MetricDetailsViewController> detail);
+  void setSelection(const QString& tech, const QString& name);
 
   const std::shared_ptr<AllMetricsViewController> controller_;
   AllMetricsListModel rows_;
@@ -61,6 +62,7 @@ class AllMetricsBinding final : public QObject {
   QString filterText_;
   QString selectedTech_;
   QString selectedName_;
+  const QObject* detail_ = nullptr;  // the one opened last; only compared
   Connection changeConnection_;
   Connection detailConnection_;
 };

@@ -9,13 +9,11 @@ FocusScope {
 
     required property AllMetricsBinding binding
     property var navigation
-    // Whether the row that was opened last is marked, as beside its detail.
-    property bool showsSelection: false
+    // The row whose detail is open is marked where the detail stands beside the list.
+    readonly property bool showsSelection: Window.width >= Theme.wideWidth
     readonly property Flickable flickable: list
 
     objectName: "AllMetricsViewController"
-    onVisibleChanged: if (visible) binding.viewWillAppear()
-    Component.onCompleted: if (visible) binding.viewWillAppear()
 
     function openFilter() {
         filterBar.isOpen = true
@@ -206,8 +204,8 @@ FocusScope {
                 ListView.view.currentIndex = index
                 root.binding.select(index)
             }
-            Keys.onReturnPressed: click()
-            Keys.onEnterPressed: click()
+            Keys.onReturnPressed: clicked()
+            Keys.onEnterPressed: clicked()
 
             background: Rectangle {
                 color: row.pressed ? Theme.pressed : row.isSelected ? Theme.card : "transparent"
