@@ -21,7 +21,7 @@ namespace quorl::test {
 using namespace std::chrono_literals;
 
 ScreenWindowTest::ScreenWindowTest() {
-  phone.time.setNow(SystemClock().now());
+  phone.time.setNow(SystemClock().now() + 1min);  // so that midnight may pass during the test
 }
 
 ScreenWindowTest::~ScreenWindowTest() {

@@ -18,7 +18,7 @@ struct sqlite3;
 namespace quorl::test {
 
 /// The product in its window on a phone in UTC and American English, with rows of an earlier run and rows that arrive.
-/// The clock starts with the machine's, as SQLite works out limits by that.
+/// The clock starts beside the machine's, as SQLite works out limits by that.
 class ScreenWindowTest : public WindowTest {
  protected:
   ScreenWindowTest();

@@ -3,6 +3,7 @@
 #include <utility>
 
 #include "hosts/desktop/QtQueue.h"
+#include "screens/export/view/SaveText.h"
 
 namespace quorl::desktop {
 namespace {
@@ -30,8 +31,9 @@ SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const st
       telephony_(queues_),
       sondrel_(captureOptions(documents), mainQueue_, queues_, clock_),
       radio_(std::move(programme), {baseband_, telephony_, mainQueue_, clock_}),
-      platform_{mainQueue_, *backgroundQueue_, queues_,    clock_, device_,     resources_, documents_, strings_,
-                console_,   alerts_,           analytics_, share_, pasteboard_, baseband_,  telephony_, &sondrel_} {
+      platform_{mainQueue_,  *backgroundQueue_, queues_,    clock_,   device_,    resources_,
+                documents_,  strings_,          console_,   alerts_,  analytics_, view::SaveText::shared(),
+                pasteboard_, baseband_,         telephony_, &sondrel_} {
   Platform::install(&platform_);
 }
 

@@ -52,7 +52,6 @@ class SimulatedDesktop {
   simulator::StandardErrorConsole console_;
   view::AlertsBinding alerts_;
   simulator::LoggedAnalytics analytics_;
-  simulator::KeptShare share_;
   QtPasteboard pasteboard_;
   simulator::BasebandManager baseband_;
   simulator::TelephonySimulator telephony_;

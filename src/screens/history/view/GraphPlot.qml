@@ -152,7 +152,9 @@ FocusScope {
     Rectangle {
         id: bubble
 
-        readonly property Item bar: root.binding.selectedIndex < 0 ? null : list.itemAtIndex(root.binding.selectedIndex)
+        // A bar that was scrolled out of sight and comes back is another item.
+        readonly property Item bar: root.binding.selectedIndex < 0 || list.contentX === undefined
+                                    ? null : list.itemAtIndex(root.binding.selectedIndex)
         readonly property real middle: bar ? list.x + bar.x - list.contentX + bar.width / 2 : 0
 
         objectName: "selectedBubble"

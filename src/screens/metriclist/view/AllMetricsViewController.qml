@@ -95,6 +95,8 @@ FocusScope {
             color: Theme.title
             Accessible.name: qsTr("Filter")
             onTextChanged: root.binding.filterText = text
+            // The shell's Escape goes back.
+            Keys.onShortcutOverride: event => event.accepted = event.key === Qt.Key_Escape
             Keys.onEscapePressed: root.closeFilter()
             Keys.onDownPressed: list.forceActiveFocus()
 
