@@ -62,7 +62,7 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 if(TARGET quorl-simulator)
   # What QML loads at run time, which no linker sees.
   set(CPACK_DEBIAN_PACKAGE_DEPENDS
-      "qml6-module-qtquick, qml6-module-qtquick-controls, qml6-module-qtquick-dialogs, qml6-module-qtquick-layouts, \
+      "qml6-module-qt-labs-folderlistmodel, qml6-module-qtquick, qml6-module-qtquick-controls, qml6-module-qtquick-dialogs, qml6-module-qtquick-layouts, \
 qml6-module-qtquick-shapes, qml6-module-qtquick-templates, qml6-module-qtquick-window, qml6-module-qtqml, \
 qml6-module-qtqml-models, qml6-module-qtqml-workerscript, libqt6svg6, qt6-qpa-plugins")
   set(CPACK_DEBIAN_PACKAGE_RECOMMENDS "fonts-inter")
