@@ -35,13 +35,25 @@ class ScreenWindowTest : public WindowTest {
   void hasADashboard();
 
   // The fixture's verbs, after each of which the window is drawn, as lists make their rows only then.
-  void launch() { drawn([this] { WindowTest::launch(); }); }
-  void settle() { drawn([this] { WindowTest::settle(); }); }
-  void pass(std::chrono::milliseconds duration) { drawn([&] { WindowTest::pass(duration); }); }
+  void launch() {
+    drawn([this] { WindowTest::launch(); });
+  }
+  void settle() {
+    drawn([this] { WindowTest::settle(); });
+  }
+  void pass(std::chrono::milliseconds duration) {
+    drawn([&] { WindowTest::pass(duration); });
+  }
   void tap(const QString& objectName) { tap(find(objectName)); }
-  void tap(QQuickItem* item) { drawn([&] { WindowTest::tap(item); }); }
-  void longPress(QQuickItem* item) { drawn([&] { WindowTest::longPress(item); }); }
-  void swipe(QQuickItem* item, int dx, int dy) { drawn([&] { WindowTest::swipe(item, dx, dy); }); }
+  void tap(QQuickItem* item) {
+    drawn([&] { WindowTest::tap(item); });
+  }
+  void longPress(QQuickItem* item) {
+    drawn([&] { WindowTest::longPress(item); });
+  }
+  void swipe(QQuickItem* item, int dx, int dy) {
+    drawn([&] { WindowTest::swipe(item, dx, dy); });
+  }
   void key(Qt::Key key, Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
     drawn([&] { WindowTest::key(key, modifiers); });
   }
