@@ -86,7 +86,10 @@ network::Plmn currentPlmn(const SubscriptionState& state) {
 }
 
 const ServingMeasurement* servingOn(const SubscriptionState& state, Technology technology) {
-  return state.serving && state.technology == technology ? &*state.serving : nullptr;
+  // On the way to another technology the cell measured last is still one of the old.
+  const bool isOnIt =
+      state.serving && state.technology == technology && state.serving->best.cell->technology == technology;
+  return isOnIt ? &*state.serving : nullptr;
 }
 
 const ServingMeasurement* lteServing(const SubscriptionState& state) {
