@@ -101,19 +101,25 @@ class Photographer : public WindowPhone {
     tap("menuCell" + QString::number(tab));
     pass(1s);
   }
+  /// Scrolls to a row of the metric list and opens it.
   void openMetric(const QString& name) {
-    for (QQuickItem* row : findAll("metricRow")) {
-      if (row->property("name") != name) continue;
-      QMetaObject::invokeMethod(row, "clicked");
-      pass(1s);
-      return;
+    QQuickItem* list = find("metricsList");
+    for (double scrolled = 0; scrolled < list->property("contentHeight").toDouble(); scrolled += list->height() / 2) {
+      list->setProperty("contentY", scrolled);
+      settle();
+      for (QQuickItem* row : findAll("metricRow")) {
+        if (row->property("name") != name) continue;
+        QMetaObject::invokeMethod(row, "clicked");
+        pass(1s);
+        return;
+      }
     }
     throw std::runtime_error(fmt::format("{} is not in the list", name.toStdString()));
   }
-  /// The recording, twice a day for a week.
+  /// The recording, twice a day for some days.
   void hearForDays() {
     const Date now = phone.time.now();
-    for (int halfDays = 13; halfDays >= 0; --halfDays) {
+    for (int halfDays = 7; halfDays >= 0; --halfDays) {
       const Date begin = now - halfDays * 12h - 11min;
       for (const simulator::RecordedEvent& event : events_) {
         phone.time.setNow(begin + std::chrono::milliseconds(event.atMs.value_or(0)));

@@ -116,12 +116,18 @@ TEST_F(HistoryWindowTest, NegativeReadingsStandOnTheBaselineInsideThePlot) {
     EXPECT_GE(place(find("barBody", bar)).top(), place(find("bars")).top());
     EXPECT_GT(height(bar), 0);
   }
-  EXPECT_THAT(column("tick", "text"), ElementsAre("-100", "-50", "0"));
+  EXPECT_THAT(column("tick", "text"), ElementsAre("-120", "-60", "0"));
 }
 
 TEST_F(HistoryWindowTest, WithoutAnyReadingItSaysSoOnAllSegments) {
-  hasStored(cellId("1", 24h * 60));
-  launchOnGraph();
+  hasStored(cellId("1"));
+  launch();
+  showsAllMetrics();
+  opens("Cell Info");
+  store().executeDashboardStatement("DELETE FROM Metric", [](bool, const std::optional<SQLiteError>&) {});
+  settle();
+  tap(inRow(row("attributeRow", "kHVCellMonitorCellId"), "graphButton"));
+  pass(600ms);
   for (int segment = 0; segment < 3; ++segment) {
     selects(segment);
     pass(500ms);

@@ -38,9 +38,8 @@ TEST_F(MetricDetailWindowTest, SpinsInPlaceOfTheRowsOnceAReadTakesLong) {
   showsAllMetrics();
   databaseQueue().setHanging(true);
   tap(row("metricRow", "Tx Power"));
-  pass(100ms);
   EXPECT_FALSE(isShown("detailSpinner"));
-  pass(100ms);
+  pass(250ms);
   EXPECT_TRUE(isShown("detailSpinner"));
   EXPECT_THAT(texts(), Contains("Loading..."));
   databaseQueue().setHanging(false);

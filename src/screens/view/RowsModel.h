@@ -127,7 +127,10 @@ class RowsModel : public QAbstractListModel {
       if (found == keys_.end()) {
         insert(i, next[i], nextKeys[i]);
       } else if (const auto from = static_cast<std::size_t>(found - keys_.begin()); stays[places.at(nextKeys[i])]) {
-        move(i, from, from + 1);  // what stands in the way goes behind it
+        // What stands in the way goes behind it, and behind all that follows it in both lists.
+        std::size_t end = from + 1;
+        while (end < keys_.size() && i + end - from < next.size() && keys_[end] == nextKeys[i + end - from]) ++end;
+        move(i, from, end);
       } else {
         move(from, from + 1, i);
       }

@@ -53,17 +53,17 @@ void CarrierBarBinding::take() {
   std::vector<TabButton> now = bar_.tabButtons();
   const int before = rowCount();
   const int after = static_cast<int>(now.size());
+  // Rows that stay keep their values until the others have come or gone.
   if (after < before) {
     beginRemoveRows({}, after, before - 1);
-    tabs_ = std::move(now);
+    tabs_.erase(tabs_.begin() + after, tabs_.end());
     endRemoveRows();
   } else if (after > before) {
     beginInsertRows({}, before, after - 1);
-    tabs_ = std::move(now);
+    tabs_.insert(tabs_.end(), now.begin() + before, now.end());
     endInsertRows();
-  } else {
-    tabs_ = std::move(now);
   }
+  tabs_ = std::move(now);
   if (after != before) emit countChanged();
   if (after > 0) emit dataChanged(index(0), index(after - 1));
   const int lit = firstLitIndex();

@@ -191,7 +191,10 @@ FocusScope {
                     }
                 }
             }
-            swipe.onCompleted: {
+            readonly property bool isSwiped: swipe.position === -1 && !pressed
+            onIsSwipedChanged: {
+                if (!isSwiped)
+                    return
                 root.binding.swipeToDelete(index)
                 stillThere.restart()
             }
