@@ -72,12 +72,15 @@ class CaptureWindowTest : public test::WindowTest {
   }
   void opens() {
     launch();
+    grab();  // lays out what stands under one another
     tap("menuCell2");
     pass(1s);
+    grab();
   }
   void opensChoice() {
     tap("configButton");
     pass(1s);
+    grab();
   }
   /// The rows that are in sight, laid out.
   std::vector<QQuickItem*> rows() {

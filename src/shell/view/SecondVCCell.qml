@@ -10,6 +10,7 @@ T.AbstractButton {
     property string leftText
     property string rightText
     property bool showsSeparator: true
+    property real sinceReleaseMs: 550
 
     implicitWidth: 320
     implicitHeight: Math.max(Theme.touch, left.implicitHeight + 4 * Theme.grid)
@@ -21,28 +22,23 @@ T.AbstractButton {
     Keys.onReturnPressed: cell.click()
     Keys.onEnterPressed: cell.click()
 
-    states: State {
-        name: "highlighted"
-        when: cell.down
-
-        PropertyChanges {
-            target: cell
-            opacity: 0.5
-        }
+    // Dims at once, and comes back in half a second after a short delay.
+    opacity: down ? 0.5 : 0.5 + 0.5 * Math.max(0, sinceReleaseMs - 50) / 500
+    onDownChanged: {
+        if (down)
+            comeBack.stop()
+        else
+            comeBack.restart()
     }
-    // Dims at once and comes back slowly.
-    transitions: Transition {
-        from: "highlighted"
 
-        SequentialAnimation {
-            PauseAnimation {
-                duration: Theme.duration(50)
-            }
-            NumberAnimation {
-                property: "opacity"
-                duration: Theme.duration(500)
-            }
-        }
+    NumberAnimation {
+        id: comeBack
+
+        target: cell
+        property: "sinceReleaseMs"
+        from: 0
+        to: 550
+        duration: Theme.duration(550)
     }
 
     background: Rectangle {
