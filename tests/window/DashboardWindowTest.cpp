@@ -124,7 +124,7 @@ TEST_F(DashboardWindowTest, AnAttributePinnedInItsDetailAppearsAtTheNextTickAndI
   EXPECT_EQ(text("swipeHint"), "Swipe to delete");
   ASSERT_NE(managed("state"), nullptr);
   swipe(managed("state"), -250, 0);
-  pass(1s);
+  pass(2s);
   EXPECT_EQ(managed("state"), nullptr);
   EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE attribute_name = 'state'"), 0);
   tap("closeButton");
