@@ -1,6 +1,8 @@
 #include <QAbstractItemModelTester>
 #include <QTest>
 #include <chrono>
+#include <cstdint>
+#include <limits>
 #include <memory>
 #include <string>
 #include <vector>
@@ -57,12 +59,17 @@ class CaptureWindowTest : public test::WindowTest {
   CaptureWindowTest() {
     isInternalBuild();
     hasLogCapture();
+    hasRoomFor(std::numeric_limits<std::uint64_t>::max());
+  }
+
+  /// Before `opens`.
+  void hasRoomFor(std::uint64_t bytes) {
     simulator::SondrelSimulator::Options options;
     options.folder = phone.directory.path() / "Sondrel";
+    options.capacity = bytes;
     library_ = std::make_unique<simulator::SondrelSimulator>(options, *phone.mainQueue, phone.time, phone.time);
     Platform::current().sondrel = library_.get();
   }
-
   void opens() {
     launch();
     tap("menuCell2");
@@ -332,6 +339,21 @@ TEST_F(CaptureWindowTest, AnAnswerWhileTheChoiceStandsOpensNoSecondOne) {
   tap("choiceDismissButton");
   pass(1s);
   EXPECT_FALSE(isShown("choiceList"));
+}
+
+TEST_F(CaptureWindowTest, AFullDiskIsToldInAnAlertAndTheFilesStay) {
+  hasRoomFor(2 * 32 * 1024);
+  opens();
+  tap("startButton");
+  pass(3s);
+  EXPECT_EQ(
+      text("alertTitle"),
+      "A log file cannot be written: No space left on device. Earlier files are kept. Make room, then start again.");
+  EXPECT_EQ(text("alertMessage"), "Error Occured");
+  tap("alertButton");
+  pass(1s);
+  EXPECT_FALSE(isShown("alertTitle"));
+  EXPECT_THAT(rows(), SizeIs(2));
 }
 
 TEST_F(CaptureWindowTest, TheTabKeepsItsStateWhenItIsLeft) {
