@@ -36,6 +36,10 @@ ScenarioChoice city(std::uint64_t seed = 1) {
 /// A phone in the city with a client of its baseband manager, on virtual time.
 class LiveScenarioTest : public testing::Test {
  protected:
+  ~LiveScenarioTest() override {
+    scenario.reset();
+    time.settle();  // the modem's last task holds the modem, and with it its queue
+  }
   void phoneIsIn(LiveScenario::Options options) {
     auto made = LiveScenario::make(std::move(options), {library, &telephony, time, *mainQueue, time});
     ASSERT_TRUE(made) << made.error();

@@ -194,8 +194,10 @@ TEST_P(DrivesOfAFamily, ShowBandwidthsThatTheDisplayKnows) {
   for (const RecordedEvent& event : eventsOf("city", GetParam(), 1, minutes(20))) {
     const auto message = makeMessage(ids.at(*event.metricID));
     message->initWithData(event.payload);
+    const auto dictionary = message->dictionaryRepresentation();
+    ASSERT_TRUE(dictionary);
     for (const char* key : {"dl_bw", "ul_bw"}) {
-      const MetricValue* value = message->dictionaryRepresentation()->find(key);
+      const MetricValue* value = dictionary->find(key);
       if (value == nullptr) continue;
       EXPECT_TRUE(known.contains(*value->integer() / factor)) << key << " " << *value->integer();
       ++shown;
@@ -273,7 +275,9 @@ TEST_P(DrivesOfAFamily, ASnapshotBringsWhatIsSoNowForBothSims) {
     EXPECT_EQ(event.atMs, 120000U);
     const auto message = makeMessage(ids.at(*event.metricID));
     message->initWithData(event.payload);
-    const MetricValue* subsId = message->dictionaryRepresentation()->find("subs_id");
+    const auto dictionary = message->dictionaryRepresentation();
+    ASSERT_TRUE(dictionary);
+    const MetricValue* subsId = dictionary->find("subs_id");
     brought[*event.metricID].insert(subsId != nullptr ? subsId->integer().value_or(-1) : -1);
   });
   const std::set<std::int64_t> both = {0, 1};
