@@ -97,6 +97,30 @@ TEST_F(StoreThreadsTest, InsertsAndReadsFromTheMainLoopKeepTheirOrder) {
   EXPECT_TRUE(sawEveryEarlierRow);
 }
 
+TEST_F(StoreThreadsTest, ReadsOfLatestValuesSeeEveryInsertThatWasCalledBefore) {
+  constexpr int kRows = 200;
+  int reads = 0;
+  int late = 0;
+  main.async([&] {
+    for (int i = 0; i < kRows; ++i) {
+      const Date last = reading(i).collectedOn;
+      database->insertMetric(reading(i), [](bool success, const auto& /*error*/) { EXPECT_TRUE(success); });
+      database->fetchAvailableMetrics(0, [&, last](const AvailableMetrics& metrics, const auto& error) {
+        EXPECT_EQ(error, std::nullopt);
+        if (metrics.at("LTE").front().collectedOn != last) ++late;
+      });
+      database->fetchMetricContents("LTE", "Serving Cell Info", reading(i).attributeName, 0,
+                                    [&, last](const std::vector<Metric>& rows, const auto& error) {
+                                      EXPECT_EQ(error, std::nullopt);
+                                      if (rows.size() != 1 || rows.front().collectedOn != last) ++late;
+                                      if (++reads == kRows) main.stop();
+                                    });
+    }
+  });
+  main.run();
+  EXPECT_EQ(late, 0);
+}
+
 TEST_F(StoreThreadsTest, EveryReadRunsBesideTheMainLoop) {
   int left = 5;
   const auto done = [&] {
