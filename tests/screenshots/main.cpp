@@ -48,6 +48,10 @@ class Photographer : public WindowPhone {
     setSize(look.size.width(), look.size.height());
     isInternalBuild();
     hasLogCapture();
+    simulator::SondrelSimulator::Options capture;
+    capture.folder = phone.directory.path() / "Sondrel";
+    library_ = std::make_unique<simulator::SondrelSimulator>(capture, *phone.mainQueue, phone.time, phone.time);
+    Platform::current().sondrel = library_.get();
     const auto script = simulator::readTelephonyScript(kResources / "telephony" / "two-sims.jsonl");
     for (const simulator::TelephonyScriptStep& step : script.steps)
       if (step.at < 12s) telephony.perform(step.event);
@@ -67,9 +71,10 @@ class Photographer : public WindowPhone {
     picture("metrics");
     openMetric("Rach Attempt");
     picture("detail");
-    tap("graphButton");
+    key(Qt::Key_Escape);
     pass(500ms);
-    tap("segment1");
+    openMetric("Nr ConnectionStats");
+    tap("graphButton");
     pass(500ms);
     picture("history");
     key(Qt::Key_Escape);
@@ -97,6 +102,10 @@ class Photographer : public WindowPhone {
   }
 
  private:
+  void tap(const QString& name) {
+    if (!isShown(name)) throw std::runtime_error(fmt::format("{} is not shown", name.toStdString()));
+    WindowPhone::tap(name);
+  }
   void select(int tab) {
     tap("menuCell" + QString::number(tab));
     pass(1s);
@@ -138,6 +147,7 @@ class Photographer : public WindowPhone {
     for (const std::string& warning : takeWarnings()) std::cerr << name << ": " << warning << '\n';
   }
 
+  std::unique_ptr<simulator::SondrelSimulator> library_;
   const std::filesystem::path folder_;
   const Look look_;
   const std::vector<simulator::RecordedEvent>& events_;
