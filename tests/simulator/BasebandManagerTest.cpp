@@ -74,6 +74,9 @@ KeyValueMessage metric(std::int64_t id) {
 
 class SimulatedBaseband : public testing::Test {
  protected:
+  ~SimulatedBaseband() override {
+    time.settle();  // what waits for delivery holds the client, and with it its queue
+  }
   zelkor::client::Result perform(std::string_view command, const KeyValueMessage& message) {
     KeyValueMessage response;
     return library.PerformCommand(manager, command, message, response);
