@@ -126,6 +126,7 @@ TEST_F(DashboardWindowTest, AnAttributePinnedInItsDetailAppearsAtTheNextTickAndI
   swipe(managed("state"), -250, 0);
   pass(2s);
   EXPECT_EQ(managed("state"), nullptr);
+  EXPECT_EQ(find("managedList")->property("count").toInt(), 2);
   EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE attribute_name = 'state'"), 0);
   tap("closeButton");
   pass(500ms);

@@ -208,9 +208,6 @@ FocusScope {
             ListView.onRemove: stillThere.stop()
         }
 
-        remove: Transition {
-            NumberAnimation { property: "x"; to: -list.width; duration: Theme.duration(200); easing.type: Easing.InCubic }
-        }
         displaced: Transition {
             NumberAnimation { property: "y"; duration: Theme.duration(200); easing.type: Easing.OutCubic }
         }
