@@ -74,8 +74,7 @@ class Photographer : public WindowPhone {
     key(Qt::Key_Escape);
     pass(500ms);
     openMetric("Nr ConnectionStats");
-    tap("graphButton");
-    pass(500ms);
+    openGraph();
     picture("history");
     key(Qt::Key_Escape);
     pass(500ms);
@@ -109,6 +108,17 @@ class Photographer : public WindowPhone {
   void select(int tab) {
     tap("menuCell" + QString::number(tab));
     pass(1s);
+  }
+  /// Opens the history of the first attribute that has one.
+  void openGraph() {
+    grab();  // lays the rows out
+    for (QQuickItem* button : findAll("graphButton")) {
+      if (!button->isVisible()) continue;
+      WindowPhone::tap(button);
+      pass(500ms);
+      return;
+    }
+    throw std::runtime_error("no attribute has a graph");
   }
   /// Scrolls to a row of the metric list and opens it.
   void openMetric(const QString& name) {
