@@ -11,6 +11,7 @@
 #include "base/Uuid.h"
 #include "shell/LogCategories.h"
 #include "store/KeptReadings.h"
+#include "store/MetricBinding.h"
 #include "store/MetricStatements.h"
 #include "store/WorkItems.h"
 
@@ -116,20 +117,9 @@ void SQLiteDatabase::createTable(std::string sql, std::string tableName, WriteCo
 
 std::optional<SQLiteError> SQLiteDatabase::bind(sqlite3_stmt* statement, const Metric& metric,
                                                 const std::string& collectedOn) {
-  // Nothing is copied: the work item holds the values until the step.
-  const auto bindText = [statement](int index, const std::string& value) {
-    return sqlite3_bind_text(statement, index, value.c_str(), -1, SQLITE_STATIC) == SQLITE_OK;
-  };
-  const auto bindInteger = [statement](int index, std::int32_t value) {
-    return sqlite3_bind_int(statement, index, value) == SQLITE_OK;
-  };
-  if (!bindText(1, metric.metricTech)) return SQLiteError{SQLiteError::Case::Prepare, libraryMessage()};
-  const bool isBound = bindText(2, metric.metricName) && bindText(3, metric.attributeName) &&
-                       bindText(4, metric.attributeValue) && bindText(5, metric.attributeValueType) &&
-                       bindInteger(6, metric.graphable ? 1 : 0) && bindText(7, metric.metricId) &&
-                       bindInteger(8, metric.subsId) && bindText(9, collectedOn);
-  if (!isBound) return SQLiteError{SQLiteError::Case::Bind, libraryMessage()};
-  return std::nullopt;
+  const int refused = bindMetric(statement, metric, collectedOn);
+  if (refused == 0) return std::nullopt;
+  return SQLiteError{refused == 1 ? SQLiteError::Case::Prepare : SQLiteError::Case::Bind, libraryMessage()};
 }
 
 std::optional<SQLiteError> SQLiteDatabase::insert(const Metric& metric) {

@@ -12,11 +12,11 @@
 #include <fcntl.h>
 #include <gtest/gtest.h>
 #include <spawn.h>
-#include <sqlite3.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include "base/Clock.h"
+#include "store/RawDatabase.h"
 #include "support/TemporaryDirectory.h"
 
 namespace quorl::test {
@@ -74,29 +74,16 @@ class Writer {
 class KilledProcess : public testing::Test {
  protected:
   /// What is wrong with the database file, "ok" if nothing is.
-  std::string integrity() { return column("PRAGMA integrity_check").at(0); }
+  std::string integrity() { return database().column("PRAGMA integrity_check").at(0); }
   std::set<std::string> storedTimestamps() {
-    const auto rows = column("SELECT attribute_value FROM Metric WHERE attribute_name = 'timestamp'");
+    const auto rows = database().column("SELECT attribute_value FROM Metric WHERE attribute_name = 'timestamp'");
     return {rows.begin(), rows.end()};
   }
 
+  RawDatabase database() const { return RawDatabase(documents / "metricPartV11.sqlite"); }
+
   TemporaryDirectory directory;
   const std::filesystem::path documents = directory.path() / "documents";
-
- private:
-  std::vector<std::string> column(const char* sql) {
-    sqlite3* handle = nullptr;
-    sqlite3_open_v2((documents / "metricPartV11.sqlite").c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr);
-    const std::unique_ptr<sqlite3, int (*)(sqlite3*)> closing(handle, sqlite3_close);
-    sqlite3_stmt* statement = nullptr;
-    EXPECT_EQ(sqlite3_prepare_v2(handle, sql, -1, &statement, nullptr), SQLITE_OK) << sqlite3_errmsg(handle);
-    const std::unique_ptr<sqlite3_stmt, int (*)(sqlite3_stmt*)> finalizing(statement, sqlite3_finalize);
-    std::vector<std::string> rows;
-    while (sqlite3_step(statement) == SQLITE_ROW)
-      rows.emplace_back(reinterpret_cast<const char*>(sqlite3_column_text(statement, 0)));
-    if (rows.empty()) rows.emplace_back("no answer");
-    return rows;
-  }
 };
 
 TEST_F(KilledProcess, NoReportedRowIsLostAndTheFileStaysWhole) {

@@ -37,6 +37,12 @@ class RawDatabase {
   RawDatabase& operator=(const RawDatabase&) = delete;
 
   std::vector<Row> run(const std::string& sql) { return test::run(database_, sql); }
+  /// The first column of the rows.
+  std::vector<std::string> column(const std::string& sql) {
+    std::vector<std::string> values;
+    for (const Row& row : run(sql)) values.push_back(row.front());
+    return values;
+  }
 
  private:
   sqlite3* database_ = nullptr;

@@ -1,15 +1,14 @@
 #include <filesystem>
-#include <memory>
 #include <string>
 #include <vector>
 
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
-#include <sqlite3.h>
 
 #include "ProgressBar.h"
 #include "ToolRun.h"
 #include "hosts/simulator/Recording.h"
+#include "store/RawDatabase.h"
 #include "support/TemporaryDirectory.h"
 
 namespace quorl::test {
@@ -18,18 +17,7 @@ namespace {
 namespace fs = std::filesystem;
 
 std::vector<std::string> rowsOf(const fs::path& file, const char* sql) {
-  sqlite3* handle = nullptr;
-  EXPECT_EQ(sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READONLY, nullptr), SQLITE_OK);
-  const std::unique_ptr<sqlite3, int (*)(sqlite3*)> closing(handle, sqlite3_close);
-  sqlite3_stmt* statement = nullptr;
-  EXPECT_EQ(sqlite3_prepare_v2(handle, sql, -1, &statement, nullptr), SQLITE_OK) << sqlite3_errmsg(handle);
-  const std::unique_ptr<sqlite3_stmt, int (*)(sqlite3_stmt*)> finalizing(statement, sqlite3_finalize);
-  std::vector<std::string> rows;
-  while (sqlite3_step(statement) == SQLITE_ROW) {
-    const unsigned char* text = sqlite3_column_text(statement, 0);
-    rows.emplace_back(text == nullptr ? "" : reinterpret_cast<const char*>(text));
-  }
-  return rows;
+  return RawDatabase(file).column(sql);
 }
 
 class Simulate : public testing::Test {

@@ -6,6 +6,7 @@
 #include <sys/stat.h>
 
 #include "base/DateText.h"
+#include "store/MetricBinding.h"
 #include "store/MetricStatements.h"
 
 namespace quorl::simulator {
@@ -72,17 +73,7 @@ bool BulkStore::bind(const Metric& metric) {
     lastDate_ = metric.collectedOn;
     lastDateText_ = wallClockText(metric.collectedOn);
   }
-  const auto bindText = [this](int index, const std::string& value) {
-    return sqlite3_bind_text(insert_.get(), index, value.c_str(), static_cast<int>(value.size()), SQLITE_STATIC) ==
-           SQLITE_OK;
-  };
-  const auto bindInteger = [this](int index, std::int32_t value) {
-    return sqlite3_bind_int(insert_.get(), index, value) == SQLITE_OK;
-  };
-  return bindText(1, metric.metricTech) && bindText(2, metric.metricName) && bindText(3, metric.attributeName) &&
-         bindText(4, metric.attributeValue) && bindText(5, metric.attributeValueType) &&
-         bindInteger(6, metric.graphable ? 1 : 0) && bindText(7, metric.metricId) && bindInteger(8, metric.subsId) &&
-         bindText(9, lastDateText_);
+  return bindMetric(insert_.get(), metric, lastDateText_) == 0;
 }
 
 void BulkStore::insertMetric(Metric metric, WriteCompletion /*completion*/) {
