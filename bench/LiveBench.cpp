@@ -3,6 +3,7 @@
 // the screen, what it costs the processor, and for how long the main thread and the database's queue are held at most.
 // QUORL_BENCH_ROWS is the number of rows (a hundred thousand), QUORL_BENCH_SECONDS the length of each part (30),
 // QUORL_BENCH_DIR the directory of the file (the working directory), which is made once and kept; the run has a copy.
+// QUORL_BENCH_FILE is a file to use in its place, one whose rows end about now.
 
 #include <algorithm>
 #include <atomic>
@@ -46,10 +47,28 @@ constexpr std::size_t kFieldsOfMetric = 8;
 constexpr Date kStart{1767605412s};  // 2026-01-05 09:30:12 UTC, when the month of rows ends
 
 /// A clock that runs from the end of the month on.
-struct RunningClock final : Clock {
-  Date now() const override { return kStart + std::chrono::duration_cast<Date::duration>(Steady::now() - begun); }
-  const Steady::time_point begun = Steady::now();
+class RunningClock final : public Clock {
+ public:
+  explicit RunningClock(Date start) : start_(start) {}
+  Date now() const override { return start_ + std::chrono::duration_cast<Date::duration>(Steady::now() - begun_); }
+
+ private:
+  const Date start_;
+  const Steady::time_point begun_ = Steady::now();
 };
+
+/// The month of rows that the run has a copy of.
+struct Month {
+  std::filesystem::path file;
+  std::string name;
+  Date end;
+};
+
+Month month() {
+  if (const char* file = std::getenv("QUORL_BENCH_FILE"); file != nullptr) return {file, file, SystemClock().now()};
+  const std::size_t rows = bench::rowCount(100'000);
+  return {bench::monthOfRows(bench::directories({"."}).front(), rows, kStart), fmt::format("{} rows", rows), kStart};
+}
 
 /// A queue that keeps for how long one of its tasks held it at most.
 class TimedQueue final : public Queue {
@@ -138,9 +157,8 @@ std::vector<Source> sources() {
 
 /// The product on real threads, with a copy of the month of rows.
 struct Site {
-  explicit Site(std::size_t rows) : directory(bench::directories({"."}).front()) {
-    std::filesystem::copy(bench::monthOfRows(bench::directories({"."}).front(), rows, kStart),
-                          directory.path() / "metricPartV11.sqlite");
+  explicit Site(const Month& month) : clock(month.end), directory(bench::directories({"."}).front()) {
+    std::filesystem::copy(month.file, directory.path() / "metricPartV11.sqlite");
     fake.documents.directory = directory.path();
     fake.properties.texts["BasebandChipset"] = "mav";
     Platform::install(&platform);
@@ -264,7 +282,7 @@ void settle(Site& site, int rounds) {
 
 [[noreturn]] void run() {
   const std::size_t seconds = bench::number("QUORL_BENCH_SECONDS", 30);
-  const std::size_t rows = bench::rowCount(100'000);
+  const Month rows = month();
   Site site(rows);
   const std::vector<Source> metrics = sources();
   const std::size_t count = seconds * kMetricsPerSecond;
@@ -283,7 +301,7 @@ void settle(Site& site, int rounds) {
   }
   site.loop->asyncAfter(1s, [&] { settle(site, 4); });
   site.loop->run();
-  fmt::print("{} rows, {} metrics a second; {:.1f} s until the screens stand, 1 s of them waiting\n", rows,
+  fmt::print("{}, {} metrics a second; {:.1f} s until the screens stand, 1 s of them waiting\n", rows.name,
              kMetricsPerSecond, Milliseconds(Steady::now() - begun).count() / 1e3);
   std::fflush(stdout);
 

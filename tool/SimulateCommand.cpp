@@ -36,6 +36,8 @@ struct Options {
   double minutes = 10;
   double speed = 0;  // 0: as fast as possible
   int historyDays = 0;
+  int sessionsPerDay = 4;
+  double sessionMinutes = 3;
   bool hasMinutes = false;
 };
 
@@ -56,6 +58,12 @@ std::optional<Date> startOf(const Options& options) {
 
 std::chrono::milliseconds lengthOf(const Options& options) {
   return std::chrono::milliseconds(std::llround(options.minutes * 60000));
+}
+
+simulator::HistoryPlan historyOf(const Options& options, const ScenarioChoice& choice, Date until) {
+  const auto session = std::chrono::duration<double, std::ratio<60>>(options.sessionMinutes);
+  return {choice, options.historyDays, until, options.sessionsPerDay,
+          std::chrono::duration_cast<std::chrono::milliseconds>(session)};
 }
 
 int fail(std::string_view text) {
@@ -84,7 +92,7 @@ int fillDocuments(const Options& options, const ScenarioChoice& choice) {
   SimulatedProduct product(options.family, options.documents);
   if (options.historyDays > 0) {
     ProgressBar bar;
-    const auto made = product.makeHistory({choice, options.historyDays, until}, [&bar](const auto& so) {
+    const auto made = product.makeHistory(historyOf(options, choice, until), [&bar](const auto& so) {
       bar.show(static_cast<double>(so.sessionsDone) / so.sessions, fmt::format("{} rows", so.rows));
     });
     if (!made) return fail(made.error());
@@ -152,6 +160,13 @@ void addSimulate(CLI::App& tool, Action& chosen) {
   command->add_option("--start", options->start, "Wall-clock time at which a recording begins, yyyy-MM-dd HH:mm:ss");
   command->add_option("--documents", options->documents, "Directory for a database; made if it is missing");
   command->add_option("--history-days", options->historyDays, "Days of history before now")->check(CLI::Range(1, 31));
+  command
+      ->add_option("--sessions-per-day", options->sessionsPerDay, "How often a day of the history the product was used")
+      ->check(CLI::Range(1, 24))
+      ->capture_default_str();
+  command->add_option("--session-minutes", options->sessionMinutes, "For how long each time")
+      ->check(CLI::Range(0.1, 720.0))
+      ->capture_default_str();
   command->add_option("--speed", options->speed, "Simulated seconds in a second; as fast as possible without it")
       ->check(CLI::Range(0.001, 100000.0));
   command->add_option("--record", options->record, "Recording of what the product was delivered");

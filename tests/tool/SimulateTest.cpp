@@ -56,7 +56,7 @@ TEST_F(Simulate, WritesARecordingThatTheSameSeedRepeats) {
 
 TEST_F(Simulate, WhatTheProductWasDeliveredReplaysIntoTheSameRows) {
   const auto lived = simulate(
-      {"--minutes", "0.5", "--documents", documents.string(), "--record", recording.string(), "--family", "ice"});
+      {"--minutes", "0.1", "--documents", documents.string(), "--record", recording.string(), "--family", "ice"});
   EXPECT_EQ(lived.exitCode, 0) << testing::PrintToString(lived);
   const auto summary = lastLine(lived);
   EXPECT_GT(summary["rowsInserted"].get<int>(), 100);
@@ -83,6 +83,17 @@ TEST_F(Simulate, MakesAHistoryThatTheProductFindsAndKeeps) {
   EXPECT_EQ(listed.exitCode, 0);
   EXPECT_NE(listed.output.find("Nr ConnectionStats"), std::string::npos);
   EXPECT_EQ(rowsOf(database, "SELECT count(*) FROM Metric"), std::vector{std::to_string(rows)});
+}
+
+TEST_F(Simulate, AHistoryIsAsLongAsItsUse) {
+  const auto made = simulate({"--documents", documents.string(), "--history-days", "3", "--sessions-per-day", "2",
+                              "--session-minutes", "0.5"});
+  EXPECT_EQ(made.exitCode, 0) << testing::PrintToString(made);
+  EXPECT_LE(lastLine(made)["sessions"].get<int>(), 8);
+  EXPECT_GE(lastLine(made)["sessions"].get<int>(), 5);
+  const auto longer = simulate({"--documents", (directory.path() / "longer").string(), "--history-days", "3",
+                                "--sessions-per-day", "2", "--session-minutes", "2"});
+  EXPECT_GT(lastLine(longer)["rows"].get<double>(), 2 * lastLine(made)["rows"].get<double>());
 }
 
 TEST_F(Simulate, TellsWhatCannotBeWritten) {

@@ -16,10 +16,10 @@ namespace quorl::simulator {
 /// while it is in the foreground.
 struct HistoryPlan {
   ScenarioChoice choice;
-  int days = 1;                     // up to `until`
-  Date until;                       // nothing is later than this
-  int sessionsPerDay = 4;           // spread over the waking hours
-  std::chrono::minutes session{3};  // length of one
+  int days = 1;                                                 // up to `until`
+  Date until;                                                   // nothing is later than this
+  int sessionsPerDay = 4;                                       // spread over the waking hours
+  std::chrono::milliseconds session = std::chrono::minutes(3);  // length of one
 };
 
 struct HistoryProgress {
