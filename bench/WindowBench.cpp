@@ -83,15 +83,18 @@ QQuickWindow& windowOf(QQmlApplicationEngine& engine) {
 /// The product behind its window. The product has no tear-down: there is one, and it stays.
 class Program {
  public:
-  Program(const std::filesystem::path& documents, double speed) {
+  /// Without a recording it goes through a scenario.
+  Program(const std::filesystem::path& documents, const std::filesystem::path& recording, double speed) {
     desktop::SimulatorOptions options;
     options.device.chipset = "mav20";
     options.device.isInternalBuild = true;
     options.speed = speed;
+    options.recording = recording;
     auto programme = options.programme();
     if (!programme) std::abort();
     events_ = programme->events;
-    phone_ = new desktop::SimulatedDesktop(options.device, documents, *std::move(programme));
+    phone_ = new desktop::SimulatedDesktop(options.device, documents);
+    if (!phone_->tuneIn(*std::move(programme))) std::abort();
     product_ = new AppDelegate;
     ApplicationLoop(*product_).launch();
     shell_ = new view::ShellBinding(*product_->window(), phone_->alerts());
@@ -176,7 +179,7 @@ void startAndFrames(const std::filesystem::path& documents, std::chrono::millise
     baselineMemory = memory();
   }
   begin = Clock::now();
-  Program program(documents, 1);
+  Program program(documents, QUORL_SOURCE_DIR "/resources/recordings/mav.jsonl", 1);
   untilFirstFrame(program.window());
   std::printf("%-44s %7.1f ms\n", "start to first frame, product", Milliseconds(Clock::now() - begin).count());
   std::printf("%-44s %7.1f MiB (empty window %.1f)\n", "memory at first frame", memory(), baselineMemory);
@@ -192,10 +195,10 @@ void startAndFrames(const std::filesystem::path& documents, std::chrono::millise
 }
 
 void memoryInTheLongRun(const std::filesystem::path& documents, std::chrono::seconds time, double speed) {
-  Program program(documents, speed);
+  Program program(documents, {}, speed);
   untilFirstFrame(program.window());
   program.showList();
-  program.phone().radio().start();
+  program.phone().startRadio();
   const auto step = std::max(time / 12, std::chrono::seconds(1));
   for (auto passed = 0s; passed <= time; passed += step) {
     std::printf("%4ld s, simulated %5.0f s: %7zu rows, %7.1f MiB\n", static_cast<long>(passed.count()),

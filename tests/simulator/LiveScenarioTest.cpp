@@ -179,6 +179,27 @@ TEST_F(LiveScenarioTest, WaitsForAProductThatCannotKeepUp) {
   EXPECT_GT(last, before + 5000);
 }
 
+TEST_F(LiveScenarioTest, StandsStillWhileThePhoneIsBehind) {
+  bool isBehind = false;
+  auto made =
+      LiveScenario::make({city()}, {library, &telephony, time, *mainQueue, time, [&isBehind] { return isBehind; }});
+  ASSERT_TRUE(made) << made.error();
+  scenario = *std::move(made);
+  std::uint64_t last = 0;
+  scenario->setObserver([&last](const auto& event, const auto&) { last = event.atMs; });
+  scenario->start();
+  time.advance(seconds(10));
+  const auto before = last;
+  EXPECT_GT(before, 5000U);
+  isBehind = true;
+  time.advance(seconds(60));
+  EXPECT_EQ(last, before);
+  isBehind = false;
+  time.advance(seconds(10));
+  EXPECT_GT(last, before + 5000);
+  EXPECT_LT(last, before + 15000) << "what it stood is not made up for";
+}
+
 TEST_F(LiveScenarioTest, RecordsWhatItDelivers) {
   const auto file = directory.path() / "live.jsonl";
   phoneIsIn({city(), 1, file});

@@ -14,7 +14,7 @@ using std::chrono::milliseconds;
 /// Between the end of the recording and its next beginning.
 constexpr milliseconds kPause{1000};
 
-std::vector<simulator::TelephonyScriptStep> atSpeed(std::vector<simulator::TelephonyScriptStep> steps, double speed) {
+PlayedRadio::Steps atSpeed(PlayedRadio::Steps steps, double speed) {
   for (simulator::TelephonyScriptStep& step : steps)
     step.at = milliseconds(static_cast<milliseconds::rep>(static_cast<double>(step.at.count()) / speed));
   return steps;

@@ -17,9 +17,10 @@ namespace quorl::desktop {
 /// Main thread.
 class PlayedRadio {
  public:
+  using Steps = std::vector<simulator::TelephonyScriptStep>;
   struct Programme {
     std::vector<simulator::RecordedEvent> events;  // in order of time
-    std::vector<simulator::TelephonyScriptStep> steps;
+    Steps steps;
     double speed = 1;  // above 0
   };
   struct Phone {

@@ -1,5 +1,7 @@
 #include "hosts/desktop/SimulatedDesktop.h"
 
+#include <QCoreApplication>
+#include <chrono>
 #include <utility>
 
 #include "hosts/desktop/QtQueue.h"
@@ -7,6 +9,11 @@
 
 namespace quorl::desktop {
 namespace {
+
+/// More tasks than this that wait mean that the phone gets less done than it is given: most of them are rows, a few
+/// milliseconds of synchronising to disk each.
+constexpr std::size_t kMostTasks = 400;
+constexpr std::chrono::seconds kLongestRest{2};
 
 simulator::SondrelSimulator::Options captureOptions(const std::filesystem::path& documents) {
   simulator::SondrelSimulator::Options options;
@@ -16,8 +23,7 @@ simulator::SondrelSimulator::Options captureOptions(const std::filesystem::path&
 
 }  // namespace
 
-SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents,
-                                   PlayedRadio::Programme programme)
+SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents)
     : activity_(std::make_shared<simulator::Activity>([] {})),
       queues_(activity_),
       mainQueue_(std::make_shared<QtQueue>("main"), activity_),
@@ -30,7 +36,6 @@ SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const st
       console_(/*isShown=*/false),
       telephony_(queues_),
       sondrel_(captureOptions(documents), mainQueue_, queues_, clock_),
-      radio_(std::move(programme), {baseband_, telephony_, mainQueue_, clock_}),
       platform_{mainQueue_,  *backgroundQueue_, queues_,    clock_,   device_,    resources_,
                 documents_,  strings_,          console_,   alerts_,  analytics_, view::SaveText::shared(),
                 pasteboard_, baseband_,         telephony_, &sondrel_} {
@@ -39,6 +44,47 @@ SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const st
 
 SimulatedDesktop::~SimulatedDesktop() {
   Platform::install(nullptr);
+}
+
+tl::expected<void, std::string> SimulatedDesktop::tuneIn(Programme programme) {
+  const bool hasScript = programme.telephony.has_value();
+  if (hasScript || !programme.events.empty())
+    played_.emplace(
+        PlayedRadio::Programme{std::move(programme.events),
+                               std::move(programme.telephony).value_or(PlayedRadio::Steps()), programme.speed},
+        PlayedRadio::Phone{baseband_, telephony_, mainQueue_, clock_});
+  if (programme.scenario) {
+    auto made =
+        simulator::LiveScenario::make({*std::move(programme.scenario), programme.speed, std::move(programme.record)},
+                                      {baseband_, hasScript ? nullptr : &telephony_, queues_, mainQueue_, clock_,
+                                       [activity = activity_] { return activity->count() > kMostTasks; }});
+    if (!made) return tl::unexpected(std::move(made.error()));
+    scenario_ = *std::move(made);
+    scenario_->advance(std::chrono::milliseconds(1));
+  }
+  comeToRest();
+  return {};
+}
+
+void SimulatedDesktop::startRadio() {
+  if (played_) played_->start();
+  if (scenario_) scenario_->start();
+}
+
+tl::expected<void, std::string> SimulatedDesktop::stopRadio() {
+  played_.reset();
+  if (!scenario_) return {};
+  scenario_->stop();
+  simulator::RecordingWriter::Outcome outcome;
+  scenario_->finishRecording([&](simulator::RecordingWriter::Outcome so) { outcome = std::move(so); });
+  comeToRest();
+  return outcome;
+}
+
+void SimulatedDesktop::comeToRest() const {
+  const auto end = std::chrono::steady_clock::now() + kLongestRest;
+  while (!activity_->isAtRest() && std::chrono::steady_clock::now() < end)
+    QCoreApplication::processEvents(QEventLoop::AllEvents, 10);
 }
 
 void SimulatedDesktop::deliver(const simulator::RecordedEvent& event) {

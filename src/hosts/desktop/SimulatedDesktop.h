@@ -3,12 +3,17 @@
 #include <filesystem>
 #include <memory>
 #include <optional>
+#include <string>
 #include <vector>
+
+#include <tl/expected.hpp>
 
 #include "base/Clock.h"
 #include "hosts/desktop/PlayedRadio.h"
+#include "hosts/desktop/Programme.h"
 #include "hosts/desktop/QtPasteboard.h"
 #include "hosts/simulator/BasebandManager.h"
+#include "hosts/simulator/LiveScenario.h"
 #include "hosts/simulator/PhoneServices.h"
 #include "hosts/simulator/SondrelSimulator.h"
 #include "hosts/simulator/TelephonySimulator.h"
@@ -24,15 +29,23 @@ namespace quorl::desktop {
 /// The product's process-wide objects refer to it, so it has to outlive all of them; a program keeps it to its end.
 class SimulatedDesktop {
  public:
-  /// Installs itself as the process's platform. SIMs are as the programme has them at its start.
-  SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents,
-                   PlayedRadio::Programme programme);
+  /// Installs itself as the process's platform. There is no radio yet, and no SIM.
+  SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents);
   ~SimulatedDesktop();
   SimulatedDesktop(const SimulatedDesktop&) = delete;
   SimulatedDesktop& operator=(const SimulatedDesktop&) = delete;
 
+  /// Finds the phone as it is at the start of the programme: its SIMs and cells; no time passes. Once at most. The
+  /// error says why the recording of it cannot be written.
+  tl::expected<void, std::string> tuneIn(Programme programme);
+  /// Lets the programme go on with the time of day.
+  void startRadio();
+  /// Ends it. The error says why its recording is not whole.
+  tl::expected<void, std::string> stopRadio();
+  /// Runs the event loop until the phone has come to rest, for two seconds at most.
+  void comeToRest() const;
+
   view::AlertsBinding& alerts() { return alerts_; }
-  PlayedRadio& radio() { return radio_; }
   /// Delivers one event as it is, beside what the radio plays.
   void deliver(const simulator::RecordedEvent& event);
   /// False while a task of any queue waits or runs, apart from those that wait for their time.
@@ -56,8 +69,9 @@ class SimulatedDesktop {
   simulator::BasebandManager baseband_;
   simulator::TelephonySimulator telephony_;
   simulator::SondrelSimulator sondrel_;
-  PlayedRadio radio_;
   Platform platform_;
+  std::unique_ptr<simulator::LiveScenario> scenario_;
+  std::optional<PlayedRadio> played_;
 };
 
 }  // namespace quorl::desktop

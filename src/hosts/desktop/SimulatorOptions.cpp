@@ -8,7 +8,11 @@
 
 #include <CLI/CLI.hpp>
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
+#include "hosts/desktop/PlayedRadio.h"
+#include "hosts/simulator/Recording.h"
+#include "hosts/simulator/ScenarioFiles.h"
 #include "hosts/simulator/TelephonyScript.h"
 #include "shell/view/QtText.h"
 
@@ -16,9 +20,14 @@ namespace quorl::desktop {
 namespace {
 
 constexpr char kUnknownChipset[] = "none";
+constexpr char kUsualScenario[] = "city";
+
+std::vector<std::filesystem::path> resources() {
+  return simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY);
+}
 
 std::optional<std::filesystem::path> shipped(const std::string& file) {
-  for (const auto& directory : simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY))
+  for (const auto& directory : resources())
     if (std::filesystem::exists(directory / file)) return directory / file;
   return std::nullopt;
 }
@@ -35,6 +44,61 @@ bool concerns(const simulator::TelephonyScriptStep& step, int sims) {
       step.event);
 }
 
+bool concerns(const simulator::network::ScriptStep& step, int sims) {
+  return std::visit(
+      [sims](const auto& action) {
+        if constexpr (requires { action.subscription; })
+          return action.subscription < sims;
+        else
+          return true;
+      },
+      step.action);
+}
+
+/// Leaves SIMs beyond the first `sims` out.
+template <typename Step>
+void keepSims(std::vector<Step>& steps, std::optional<int> sims) {
+  if (sims) std::erase_if(steps, [sims](const Step& step) { return !concerns(step, *sims); });
+}
+
+std::string joined(const std::vector<std::string>& texts, const char* between) {
+  return fmt::format("{}", fmt::join(texts, between));
+}
+
+bool isIce(const simulator::DeviceDescription& device) {
+  return device.chipset && device.chipset->find("ice") != std::string::npos;
+}
+
+tl::expected<simulator::ScenarioChoice, std::string> scenarioOf(const SimulatorOptions& options) {
+  auto scenario = simulator::findScenario(options.scenario.empty() ? kUsualScenario : options.scenario, resources());
+  if (!scenario) return tl::unexpected(joined(scenario.error(), "\n"));
+  if (options.sims)
+    for (std::size_t slot = static_cast<std::size_t>(*options.sims); slot < scenario->sims.size(); ++slot)
+      scenario->sims[slot].isPresent = false;
+  keepSims(scenario->steps, options.sims);
+  return simulator::ScenarioChoice{
+      *std::move(scenario), options.seed,
+      isIce(options.device) ? simulator::metrics::Family::Ice : simulator::metrics::Family::Mav};
+}
+
+tl::expected<std::vector<simulator::RecordedEvent>, std::string> recordingOf(const std::filesystem::path& file) {
+  auto read = simulator::readRecording(file);
+  if (!read) return tl::unexpected(fmt::format("{}: {}", file.string(), read.error()));
+  if (!read->faults.empty())
+    return tl::unexpected(
+        fmt::format("{}:{}: {}", file.string(), read->faults.front().line, read->faults.front().reason));
+  return std::move(read->events);
+}
+
+tl::expected<PlayedRadio::Steps, std::string> scriptOf(const SimulatorOptions& options) {
+  const auto file = options.telephony.empty() ? shipped("telephony/two-sims.jsonl") : std::optional(options.telephony);
+  if (!file) return tl::unexpected(std::string("the shipped telephony script is missing; name one with --telephony"));
+  simulator::TelephonyScript script = simulator::readTelephonyScript(*file);
+  if (!script.problems.empty()) return tl::unexpected(logText(script.problems.front()));
+  keepSims(script.steps, options.sims);
+  return std::move(script.steps);
+}
+
 }  // namespace
 
 tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** argv) {
@@ -49,12 +113,25 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
   app.add_flag("--internal-build", options.device.isInternalBuild, "Be an internal build");
   app.add_flag("--carrier-build", options.device.isCarrierBuild, "Be a carrier build");
   app.add_option("--device-class", deviceClass, "Device class; Tabrin is a tablet");
-  app.add_option("--sims", options.sims, "How many SIMs the phone has")->check(CLI::Range(0, 2))->capture_default_str();
-  app.add_option("--recording", options.recording, "Recording to play over and over; the shipped one if not given")
+  app.add_option("--sims", options.sims, "How many SIMs the phone has at most; as many as the scenario if not given")
+      ->check(CLI::Range(0, 2));
+  app.add_option("--scenario", options.scenario,
+                 fmt::format("Scenario to go through: {}, or a file; the usual one is {}",
+                             joined(simulator::scenarioNames(resources()), ", "), kUsualScenario));
+  app.add_option("--seed", options.seed, "Which of the scenario's runs")->capture_default_str();
+  auto* recording =
+      app.add_option("--recording", options.recording, "Recording to play over and over in place of a scenario")
+          ->check(CLI::ExistingFile)
+          ->excludes("--scenario");
+  app.add_option("--telephony", options.telephony,
+                 "Telephony script to play once; what the scenario has, or beside a recording the shipped one, if not "
+                 "given")
       ->check(CLI::ExistingFile);
-  app.add_option("--telephony", options.telephony, "Telephony script to play once; the shipped one if not given")
-      ->check(CLI::ExistingFile);
-  app.add_option("--speed", options.speed, "How many times as fast recording and script are played")
+  app.add_option("--record", options.record, "Write what the scenario delivers to this recording")->excludes(recording);
+  app.add_option("--history-days", options.historyDays, "Days of history that the phone has before its first start")
+      ->check(CLI::Range(0, 31))
+      ->capture_default_str();
+  app.add_option("--speed", options.speed, "How many times as fast as life everything goes")
       ->check(CLI::Range(0.01, 1000.0))
       ->capture_default_str();
   app.add_option("--documents", options.documents, "Directory for the database; made if it is missing");
@@ -76,28 +153,30 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
   return options;
 }
 
-tl::expected<PlayedRadio::Programme, std::string> SimulatorOptions::programme() const {
-  PlayedRadio::Programme programme;
+tl::expected<Programme, std::string> SimulatorOptions::programme() const {
+  Programme programme;
   programme.speed = speed;
-  const bool isIce = device.chipset && device.chipset->find("ice") != std::string::npos;
-  const auto recordingFile =
-      recording.empty() ? shipped(isIce ? "recordings/ice.jsonl" : "recordings/mav.jsonl") : std::optional(recording);
-  if (!recordingFile) return tl::unexpected(std::string("the shipped recording is missing; name one with --recording"));
-  auto read = simulator::readRecording(*recordingFile);
-  if (!read) return tl::unexpected(fmt::format("{}: {}", recordingFile->string(), read.error()));
-  if (!read->faults.empty())
-    return tl::unexpected(
-        fmt::format("{}:{}: {}", recordingFile->string(), read->faults.front().line, read->faults.front().reason));
-  programme.events = std::move(read->events);
-
-  const auto scriptFile = telephony.empty() ? shipped("telephony/two-sims.jsonl") : std::optional(telephony);
-  if (!scriptFile)
-    return tl::unexpected(std::string("the shipped telephony script is missing; name one with --telephony"));
-  simulator::TelephonyScript script = simulator::readTelephonyScript(*scriptFile);
-  if (!script.problems.empty()) return tl::unexpected(logText(script.problems.front()));
-  std::copy_if(script.steps.begin(), script.steps.end(), std::back_inserter(programme.steps),
-               [this](const auto& step) { return concerns(step, sims); });
+  if (recording.empty()) {
+    auto chosen = scenarioOf(*this);
+    if (!chosen) return tl::unexpected(std::move(chosen.error()));
+    programme.scenario = *std::move(chosen);
+    if (!record.empty()) programme.record = record;
+  } else {
+    auto events = recordingOf(recording);
+    if (!events) return tl::unexpected(std::move(events.error()));
+    programme.events = *std::move(events);
+  }
+  if (recording.empty() && telephony.empty()) return programme;
+  auto steps = scriptOf(*this);
+  if (!steps) return tl::unexpected(std::move(steps.error()));
+  programme.telephony = *std::move(steps);
   return programme;
+}
+
+std::optional<simulator::HistoryPlan> SimulatorOptions::history(const Programme& programme, Date until) const {
+  const bool hasFamily = device.chipset && (isIce(device) || device.chipset->find("mav") != std::string::npos);
+  if (!hasFamily || !programme.scenario || historyDays == 0) return std::nullopt;
+  return simulator::HistoryPlan{*programme.scenario, historyDays, until};
 }
 
 }  // namespace quorl::desktop

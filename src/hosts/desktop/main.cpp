@@ -5,15 +5,22 @@
 #include <QQuickWindow>
 #include <QTimer>
 #include <chrono>
+#include <clocale>
 #include <cstdlib>
+#include <filesystem>
 #include <iostream>
 #include <memory>
+#include <optional>
+#include <string>
+#include <system_error>
+#include <utility>
 
 #include <spdlog/sinks/stdout_color_sinks.h>
 
 #include "app/AppDelegate.h"
 #include "base/SpdlogSink.h"
 #include "hosts/desktop/Lifecycle.h"
+#include "hosts/desktop/QuitOnSignal.h"
 #include "hosts/desktop/SimulatedDesktop.h"
 #include "hosts/desktop/SimulatorOptions.h"
 #include "hosts/desktop/SystemAppearance.h"
@@ -22,6 +29,7 @@
 #include "shell/LogCategories.h"
 #include "shell/view/QmlModule.h"
 #include "shell/view/ShellBinding.h"
+#include "store/DBManager.h"
 
 namespace {
 
@@ -32,21 +40,40 @@ constexpr char kTabletClass[] = "Tabrin";
 constexpr QSize kPhone{390, 844};
 constexpr QSize kTablet{1024, 768};
 
-/// Gives what is still being stored a moment to get there.
-void comeToRest(const desktop::SimulatedDesktop& phone) {
-  const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(2);
-  while (!phone.isAtRest() && std::chrono::steady_clock::now() < end)
-    QCoreApplication::processEvents(QEventLoop::AllEvents, 10);
+/// A system that has no language, such as a bare container, reads the English string table rather than raw names.
+void readEnglishWithoutALanguage() {
+  const std::string language = std::setlocale(LC_MESSAGES, nullptr);
+  if (language != "C" && language != "POSIX" && language != "C.UTF-8") return;
+  std::setlocale(LC_MESSAGES, "C.UTF-8");
+  setenv("LANGUAGE", "en", /*overwrite=*/0);
+}
+
+int fail(const std::string& text) {
+  std::cerr << "quorl-simulator: " << text << '\n';
+  return EXIT_FAILURE;
+}
+
+/// Gives a phone without a database the history that was asked for. The error is a line for the user.
+tl::expected<void, std::string> makeHistory(const SimulatorOptions& options, const desktop::Programme& programme) {
+  const std::optional<std::string> file = databasePath();
+  std::error_code ignored;
+  if (!file || std::filesystem::exists(*file, ignored)) return {};
+  const auto plan = options.history(programme, SystemClock().now());
+  if (!plan) return {};
+  const auto made = simulator::writeHistory(*file, *plan, {});
+  if (!made) return tl::unexpected(made.error());
+  std::cerr << "quorl-simulator: a history of " << made->rows << " rows over " << plan->days << " days is in " << *file
+            << '\n';
+  return {};
 }
 
 int run(QGuiApplication& application, const SimulatorOptions& options) {
   auto programme = options.programme();
-  if (!programme) {
-    std::cerr << "quorl-simulator: " << programme.error() << '\n';
-    return EXIT_FAILURE;
-  }
+  if (!programme) return fail(programme.error());
   // The product has no tear-down: what is made here lives until the process ends.
-  static auto* phone = new desktop::SimulatedDesktop(options.device, options.documents, *std::move(programme));
+  static auto* phone = new desktop::SimulatedDesktop(options.device, options.documents);
+  if (const auto made = makeHistory(options, *programme); !made) return fail(made.error());
+  if (const auto ready = phone->tuneIn(*std::move(programme)); !ready) return fail(ready.error());
   static auto* product = new AppDelegate;
   desktop::Lifecycle lifecycle(*product);
   lifecycle.launch();
@@ -63,7 +90,7 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
   engine.load(QUrl(view::kAppWindowUrl));
   auto* window = qobject_cast<QQuickWindow*>(engine.rootObjects().value(0));
   if (window == nullptr) return EXIT_FAILURE;
-  phone->radio().start();
+  phone->startRadio();
 
   desktop::UnwatchedRun unwatched(*window, shell, *product->window()->rootViewController()->rootScreen());
   if (options.prints) unwatched.printChanges();
@@ -78,7 +105,7 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
   }
   const int code = application.exec();
   lifecycle.terminate();
-  comeToRest(*phone);
+  if (const auto whole = phone->stopRadio(); !whole) return fail(options.record.string() + ": " + whole.error());
   return code;
 }
 
@@ -94,6 +121,8 @@ int main(int argc, char** argv) {
   int code = EXIT_FAILURE;
   {
     QGuiApplication application(argc, argv);
+    readEnglishWithoutALanguage();
+    const desktop::QuitOnSignal quitting;
     code = run(application, *options);
   }
   // Threads of the product still live.

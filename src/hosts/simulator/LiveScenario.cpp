@@ -30,6 +30,7 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
         baseband_(surroundings.baseband),
         mainQueue_(surroundings.mainQueue),
         clock_(surroundings.clock),
+        isBehind_(surroundings.isBehind),
         queue_(surroundings.queues.makeSerialQueue("modem")),
         telephony_(surroundings.telephony != nullptr ? std::optional<TelephonyFeed>(*surroundings.telephony)
                                                      : std::nullopt),
@@ -105,6 +106,7 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
     const Date now = clock_.now();
     const double passedMs = std::chrono::duration<double, std::milli>(now - last_).count();
     last_ = now;
+    if (isBehind_ && isBehind_()) return planStep();
     owedMs_ += std::clamp(passedMs, 0.0, kLongestStepMs) * speed_;
     const double whole = std::floor(owedMs_);
     owedMs_ -= whole;
@@ -117,6 +119,7 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
   BasebandManager& baseband_;
   Queue& mainQueue_;
   const Clock& clock_;
+  const std::function<bool()> isBehind_;
   const std::shared_ptr<Queue> queue_;
   std::atomic<std::uint64_t> events_{0};
   // On the queue alone.

@@ -22,8 +22,8 @@ namespace quorl::simulator {
 /// Lets a scenario happen beside the product: its metrics come out of the baseband manager as it goes, a query brings
 /// a snapshot of them, the telephony service tells of the same world, and the metrics can be recorded.
 ///
-/// The modem lives on a serial queue of its own. It waits for the main queue between two steps, so a product that
-/// cannot keep up makes the simulated time slower and nothing piles up.
+/// The modem lives on a serial queue of its own. It waits for the main queue between two steps, and stands still while
+/// the phone is behind, so a product that cannot keep up makes the simulated time slower and nothing piles up.
 class LiveScenario {
  public:
   struct Options {
@@ -37,6 +37,8 @@ class LiveScenario {
     QueueFactory& queues;
     Queue& mainQueue;
     const Clock& clock;
+    /// Whether the phone has more to do than it gets done. Asked on the modem's queue; empty: it never has.
+    std::function<bool()> isBehind{};
   };
   using Observer = ScenarioRun::Observer;
 

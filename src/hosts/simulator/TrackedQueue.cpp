@@ -17,9 +17,9 @@ void Activity::end() {
   onRest_();
 }
 
-bool Activity::isAtRest() const {
+std::size_t Activity::count() const {
   const std::lock_guard lock(mutex_);
-  return count_ == 0;
+  return count_;
 }
 
 void TrackedQueue::async(Task task) {

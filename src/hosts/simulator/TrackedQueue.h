@@ -20,7 +20,9 @@ class Activity {
 
   void begin();
   void end();
-  bool isAtRest() const;
+  bool isAtRest() const { return count() == 0; }
+  /// Tasks that wait or run.
+  std::size_t count() const;
 
  private:
   const std::function<void()> onRest_;
