@@ -57,7 +57,7 @@ void addEvent(Seeds& seeds, const quorl::simulator::RecordedEvent& event) {
     seeds.add("MessageReader", index + payload);
     message->initWithData(event.payload);
     if (const auto dictionary = message->dictionaryRepresentation())
-      seeds.add("JsonInput", index + quorl::tool::toJson(*dictionary).dump());
+      seeds.add("JsonInput", index + quorl::tool::messageLine(dictionary));
   }
 }
 

@@ -13,7 +13,7 @@
 
 #include "Commands.h"
 #include "Documents.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 #include "Player.h"
 #include "TextTable.h"
 #include "ToolLog.h"
@@ -161,26 +161,26 @@ int showCarriers(const Options& options) {
 
 }  // namespace
 
-void addCarriers(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("carriers", "Play a telephony script and show the carriers and their tabs");
-  command->footer(
+void addCarriers(CommandLine& tool) {
+  Command command = tool.addCommand("carriers", "Play a telephony script and show the carriers and their tabs");
+  command.setFooter(
       "Starts the product on a simulated phone, plays the script, and shows the record of each slot, the tabs of the\n"
       "carrier bar, and the subscription that the screens show. Without --documents nothing is kept.");
   auto options = std::make_shared<Options>();
-  command->add_option("--telephony", options->telephonyScript, "Telephony script to play")->required();
-  command->add_option("--until-ms", options->untilMs, "Stop after the events of this time; all of them if left out")
-      ->check(CLI::NonNegativeNumber);
-  command->add_option("--press", options->pressedTabs, "Press this tab at the end, counted from 1; may be repeated");
-  command->add_option("--documents", options->documents, "Directory for the database; made if it is missing");
-  command->add_option("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")
-      ->capture_default_str();
-  command->add_flag("--internal-build", options->device.isInternalBuild, "Be an internal build, which has band rows");
-  command->add_flag("--carrier-build", options->device.isCarrierBuild, "Be a carrier build, which has band rows");
-  command->add_flag("--json", options->asJson, "One JSON object a line");
-  command->add_flag("--verbose", options->isVerbose, "Show the log on standard error");
-  command->callback([&chosen, options] {
+  command.addOption("--telephony", options->telephonyScript, "Telephony script to play").required();
+  command.addOption("--until-ms", options->untilMs, "Stop after the events of this time; all of them if left out")
+      .notNegative();
+  command.addOption("--press", options->pressedTabs, "Press this tab at the end, counted from 1; may be repeated");
+  command.addOption("--documents", options->documents, "Directory for the database; made if it is missing");
+  command.addOption("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")
+      .showDefault();
+  command.addFlag("--internal-build", options->device.isInternalBuild, "Be an internal build, which has band rows");
+  command.addFlag("--carrier-build", options->device.isCarrierBuild, "Be a carrier build, which has band rows");
+  command.addFlag("--json", options->asJson, "One JSON object a line");
+  command.addFlag("--verbose", options->isVerbose, "Show the log on standard error");
+  command.setAction([options] {
     options->device.chipset = options->chipset;
-    chosen = [options] { return showCarriers(*options); };
+    return showCarriers(*options);
   });
 }
 

@@ -5,7 +5,7 @@
 
 #include "CatalogueClass.h"
 #include "Commands.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MetricCodable.h"
 
@@ -14,26 +14,26 @@ namespace {
 
 int printCatalogue() {
   for (const MetricGroupV2& row : MetricGroupV2::metricGroupData()) {
-    const Json line = {{"tech", row.tech},
-                       {"name", row.name},
-                       {"zelkorId", row.zelkorId},
-                       {"hex", fmt::format("{:2X}", row.zelkorId)},
-                       {"className", row.className},
-                       {"deviceType", row.deviceType},
-                       {"decodable", makeMessage(decodingClass(row)) != nullptr}};
-    std::cout << jsonLine(line) << '\n';
+    std::cout << jsonLine({{"tech", row.tech},
+                           {"name", row.name},
+                           {"zelkorId", row.zelkorId},
+                           {"hex", fmt::format("{:2X}", row.zelkorId)},
+                           {"className", row.className},
+                           {"deviceType", row.deviceType},
+                           {"decodable", makeMessage(decodingClass(row)) != nullptr}})
+              << '\n';
   }
   return kSuccess;
 }
 
 }  // namespace
 
-void addCatalogue(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("catalogue", "Print the metrics that can be decoded");
-  command->footer(
+void addCatalogue(CommandLine& tool) {
+  Command command = tool.addCommand("catalogue", "Print the metrics that can be decoded");
+  command.setFooter(
       "Prints the rows of the metric catalogue in their order, one JSON object a line. \"decodable\" says whether\n"
       "metrics of the row's id can be decoded; some rows name a class that does not exist.");
-  command->callback([&chosen] { chosen = printCatalogue; });
+  command.setAction(printCatalogue);
 }
 
 }  // namespace quorl::tool

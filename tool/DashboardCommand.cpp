@@ -2,7 +2,7 @@
 #include <memory>
 
 #include "Commands.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 #include "StoreSession.h"
 #include "TextTable.h"
 #include "base/DateText.h"
@@ -42,17 +42,15 @@ int showDashboard(StoreSession& session, bool asJson) {
 
 }  // namespace
 
-void addDashboard(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("dashboard", "Print the pinned attributes with their latest values");
-  command->footer(
+void addDashboard(CommandLine& tool) {
+  Command command = tool.addCommand("dashboard", "Print the pinned attributes with their latest values");
+  command.setFooter(
       "Fewer than two readings count as none. As at every start of the product, the default attributes are pinned "
       "then,\non top of what is there.");
   auto options = std::make_shared<StoreOptions>();
-  addStoreOptions(*command, *options, /*isTable=*/true);
-  command->callback([&chosen, options] {
-    chosen = [options] {
-      return withStore(*options, [&](StoreSession& session) { return showDashboard(session, options->asJson); });
-    };
+  addStoreOptions(command, *options, /*isTable=*/true);
+  command.setAction([options] {
+    return withStore(*options, [&](StoreSession& session) { return showDashboard(session, options->asJson); });
   });
 }
 

@@ -1,5 +1,6 @@
 #include <iostream>
 #include <memory>
+#include <optional>
 #include <string>
 
 #include <fmt/format.h>
@@ -18,31 +19,31 @@ int decode(const std::string& className) {
   int exitCode = kSuccess;
   std::string line;
   for (std::size_t number = 1; std::getline(std::cin, line); ++number) {
-    Json result;  // null
+    std::optional<MetricDictionary> result;
     if (const auto payload = hexBytes(line)) {
       const std::unique_ptr<MetricCodable> message(table->make());
       message->initWithData(ByteString(*payload));
-      if (const auto dictionary = message->dictionaryRepresentation()) result = toJson(*dictionary);
+      result = message->dictionaryRepresentation();
     } else {
       complain(fmt::format("line {}: not hexadecimal", number));
       exitCode = kFailure;
     }
-    std::cout << jsonLine(result) << '\n';
+    std::cout << messageLine(result) << '\n';
   }
   return exitCode;
 }
 
 }  // namespace
 
-void addDecode(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("decode", "Read payloads and print them as JSON");
-  command->footer(
+void addDecode(CommandLine& tool) {
+  Command command = tool.addCommand("decode", "Read payloads and print them as JSON");
+  command.setFooter(
       "Reads one payload a line in hexadecimal from standard input and prints a line for each: the metric dictionary,\n"
       "or null when the payload cannot be read whole. A line that is not hexadecimal prints null too, is reported,\n"
       "and makes the exit code 1.");
   auto className = std::make_shared<std::string>();
-  command->add_option("--class", *className, "Message class, such as KCellularEmmContext")->required();
-  command->callback([&chosen, className] { chosen = [className] { return decode(*className); }; });
+  command.addOption("--class", *className, "Message class, such as KCellularEmmContext").required();
+  command.setAction([className] { return decode(*className); });
 }
 
 }  // namespace quorl::tool

@@ -14,10 +14,8 @@ namespace quorl::tool {
 namespace {
 
 tl::expected<std::string, std::string> encodeLine(const MessageTable& table, const std::string& line) {
-  const Json object = Json::parse(line, nullptr, /*allow_exceptions=*/false);
-  if (object.is_discarded()) return tl::unexpected(std::string("not JSON"));
   const std::unique_ptr<MetricCodable> message(table.make());
-  if (auto filled = fillFromJson(*message, object); !filled) return tl::unexpected(std::move(filled.error()));
+  if (auto filled = fillFromJson(*message, line); !filled) return tl::unexpected(std::move(filled.error()));
   WireWriter writer;
   message->writeTo(writer);
   return hexText(writer.bytes());
@@ -41,15 +39,15 @@ int encode(const std::string& className) {
 
 }  // namespace
 
-void addEncode(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("encode", "Write payloads from JSON");
-  command->footer(
+void addEncode(CommandLine& tool) {
+  Command command = tool.addCommand("encode", "Write payloads from JSON");
+  command.setFooter(
       "The other way round from decode: reads one message a line as JSON, in the form that decode prints, and prints\n"
       "its payload in hexadecimal. A line that is no such message is reported and left out, and makes the exit code "
       "1.");
   auto className = std::make_shared<std::string>();
-  command->add_option("--class", *className, "Message class, such as KCellularEmmContext")->required();
-  command->callback([&chosen, className] { chosen = [className] { return encode(*className); }; });
+  command.addOption("--class", *className, "Message class, such as KCellularEmmContext").required();
+  command.setAction([className] { return encode(*className); });
 }
 
 }  // namespace quorl::tool

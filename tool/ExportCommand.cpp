@@ -61,18 +61,16 @@ int exportRows(StoreSession& session, const Options& options) {
 
 }  // namespace
 
-void addExport(CLI::App& tool, Action& chosen) {
-  auto* command =
-      tool.add_subcommand("export", "Print all stored rows of a time frame, as the export screen shares them");
-  command->footer("The text has no line break, not even at its end, and mixes both subscriptions.");
+void addExport(CommandLine& tool) {
+  Command command =
+      tool.addCommand("export", "Print all stored rows of a time frame, as the export screen shares them");
+  command.setFooter("The text has no line break, not even at its end, and mixes both subscriptions.");
   auto options = std::make_shared<Options>();
-  addTimeFrameOption(*command, options->timeFrame);
-  command->add_option("--output", options->output, "File to write to instead of standard output");
-  addStoreOptions(*command, options->store, /*isTable=*/false);
-  command->callback([&chosen, options] {
-    chosen = [options] {
-      return withStore(options->store, [&](StoreSession& session) { return exportRows(session, *options); });
-    };
+  addTimeFrameOption(command, options->timeFrame);
+  command.addOption("--output", options->output, "File to write to instead of standard output");
+  addStoreOptions(command, options->store, /*isTable=*/false);
+  command.setAction([options] {
+    return withStore(options->store, [&](StoreSession& session) { return exportRows(session, *options); });
   });
 }
 

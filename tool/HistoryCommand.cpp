@@ -9,7 +9,7 @@
 #include <unistd.h>
 
 #include "Commands.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 #include "StoreSession.h"
 #include "TextTable.h"
 #include "TimeFrameOption.h"
@@ -97,22 +97,19 @@ int showHistory(StoreSession& session, const Options& options) {
 
 }  // namespace
 
-void addHistory(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("history", "Print the readings of an attribute over time");
-  command->footer(
+void addHistory(CommandLine& tool) {
+  Command command = tool.addCommand("history", "Print the readings of an attribute over time");
+  command.setFooter(
       "daily: the readings of today, of one subscription. weekly, monthly: an average for each day, of both\n"
       "subscriptions together. On a terminal each line has a bar.");
   auto options = std::make_shared<Options>();
-  command->add_option("--metric", options->metric, "Metric, such as \"Cell Info\"")->required();
-  command->add_option("--attribute", options->attribute, "Attribute as stored, such as kHVCellMonitorCellId")
-      ->required();
-  addTimeFrameOption(*command, options->timeFrame);
-  command->add_flag("--chart", options->isCharted, "Draw bars even if the output is no terminal");
-  addStoreOptions(*command, options->store, /*isTable=*/true);
-  command->callback([&chosen, options] {
-    chosen = [options] {
-      return withStore(options->store, [&](StoreSession& session) { return showHistory(session, *options); });
-    };
+  command.addOption("--metric", options->metric, "Metric, such as \"Cell Info\"").required();
+  command.addOption("--attribute", options->attribute, "Attribute as stored, such as kHVCellMonitorCellId").required();
+  addTimeFrameOption(command, options->timeFrame);
+  command.addFlag("--chart", options->isCharted, "Draw bars even if the output is no terminal");
+  addStoreOptions(command, options->store, /*isTable=*/true);
+  command.setAction([options] {
+    return withStore(options->store, [&](StoreSession& session) { return showHistory(session, *options); });
   });
 }
 

@@ -29,15 +29,16 @@ int writeRecording(const Options& options) {
 
 }  // namespace
 
-void addMakeRecording(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("make-recording", "Make a recording of invented events");
-  command->footer("The recordings that ship with the project are made by it. The same seed gives the same recording.");
-  command->group("");  // of no use but to the project itself
+void addMakeRecording(CommandLine& tool) {
+  Command command = tool.addCommand("make-recording", "Make a recording of invented events");
+  command.setFooter(
+      "The recordings that ship with the project are made by it. The same seed gives the same recording.");
+  command.hide();  // of no use but to the project itself
   auto options = std::make_shared<Options>();
-  command->add_option("--family", options->family, "Baseband family")->required()->check(CLI::IsMember({"mav", "ice"}));
-  command->add_option("--seed", options->seed, "Where the invention starts")->capture_default_str();
-  command->add_option("--output", options->output, "File to write")->required();
-  command->callback([&chosen, options] { chosen = [options] { return writeRecording(*options); }; });
+  command.addOption("--family", options->family, "Baseband family").required().oneOf({"mav", "ice"});
+  command.addOption("--seed", options->seed, "Where the invention starts").showDefault();
+  command.addOption("--output", options->output, "File to write").required();
+  command.setAction([options] { return writeRecording(*options); });
 }
 
 }  // namespace quorl::tool

@@ -11,6 +11,7 @@
 #include <variant>
 
 #include <fmt/format.h>
+#include <nlohmann/json.hpp>
 
 #include "Hexadecimal.h"
 #include "messages/MessageFields.h"
@@ -20,7 +21,11 @@
 namespace quorl::tool {
 namespace {
 
-Json toJson(const MetricValue& value);
+using Json = nlohmann::ordered_json;  // keeps the order of a message's table
+
+constexpr char kBytesKey[] = "$bytes";
+
+Json toJson(const MetricDictionary& dictionary);
 
 Json bytesJson(std::string_view bytes) {
   Json object = Json::object();
@@ -36,10 +41,10 @@ struct ValueToJson {
   Json operator()(const MetricFloat& number) const { return number.value; }
   Json operator()(const Text& text) const { return text.view(); }
   Json operator()(const ByteString& bytes) const { return bytesJson(bytes.view()); }
-  Json operator()(const MetricDictionary& dictionary) const { return tool::toJson(dictionary); }
+  Json operator()(const MetricDictionary& dictionary) const { return toJson(dictionary); }
   Json operator()(const MetricDictionaryList& list) const {
     Json array = Json::array();
-    for (const MetricDictionary& element : list) array.push_back(tool::toJson(element));
+    for (const MetricDictionary& element : list) array.push_back(toJson(element));
     return array;
   }
   Json operator()(const NumberList& list) const {
@@ -57,6 +62,12 @@ struct ValueToJson {
 
 Json toJson(const MetricValue& value) {
   return std::visit(ValueToJson{}, static_cast<const MetricValue::variant&>(value));
+}
+
+Json toJson(const MetricDictionary& dictionary) {
+  Json object = Json::object();
+  for (const MetricEntry& entry : dictionary.entries()) object[entry.key.string()] = toJson(entry.value);
+  return object;
 }
 
 using Outcome = tl::expected<void, std::string>;
@@ -218,17 +229,14 @@ Outcome fillObject(MetricCodable& message, const Json& object, const std::string
 
 }  // namespace
 
-Json toJson(const MetricDictionary& dictionary) {
-  Json object = Json::object();
-  for (const MetricEntry& entry : dictionary.entries()) object[entry.key.string()] = toJson(entry.value);
-  return object;
+std::string messageLine(const std::optional<MetricDictionary>& dictionary) {
+  const Json object = dictionary ? toJson(*dictionary) : Json();
+  return object.dump(-1, ' ', /*ensure_ascii=*/false, Json::error_handler_t::replace);
 }
 
-std::string jsonLine(const Json& value) {
-  return value.dump(-1, ' ', /*ensure_ascii=*/false, Json::error_handler_t::replace);
-}
-
-tl::expected<void, std::string> fillFromJson(MetricCodable& message, const Json& object) {
+tl::expected<void, std::string> fillFromJson(MetricCodable& message, std::string_view json) {
+  const Json object = Json::parse(json, nullptr, /*allow_exceptions=*/false);
+  if (object.is_discarded()) return tl::unexpected(std::string("not JSON"));
   return fillObject(message, object, "");
 }
 

@@ -1,8 +1,9 @@
 #pragma once
 
+#include <optional>
 #include <string>
+#include <string_view>
 
-#include <nlohmann/json.hpp>
 #include <tl/expected.hpp>
 
 #include "messages/MetricCodable.h"
@@ -13,18 +14,12 @@
 
 namespace quorl::tool {
 
-/// Keeps the order of a message's table.
-using Json = nlohmann::ordered_json;
+/// One line, without its line break, in the order of the message's table; null for no dictionary.
+std::string messageLine(const std::optional<MetricDictionary>& dictionary);
 
-inline constexpr char kBytesKey[] = "$bytes";
-
-Json toJson(const MetricDictionary& dictionary);
-
-/// One line, without its line break.
-std::string jsonLine(const Json& value);
-
-/// Sets each field that `object` names. The error names the place and says what is wrong there; the message is then
-/// half filled. An enumerator that has no name may be given as "(unknown: 17)", as it is shown, or as 17.
-tl::expected<void, std::string> fillFromJson(MetricCodable& message, const Json& object);
+/// Sets each field that `json`, the text of an object, names. The error says what is wrong and names the place; the
+/// message is then half filled. An enumerator that has no name may be given as "(unknown: 17)", as it is shown, or as
+/// 17.
+tl::expected<void, std::string> fillFromJson(MetricCodable& message, std::string_view json);
 
 }  // namespace quorl::tool

@@ -2,7 +2,7 @@
 #include <memory>
 
 #include "Commands.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 #include "StoreSession.h"
 #include "TextTable.h"
 #include "base/DateText.h"
@@ -44,17 +44,15 @@ int listMetrics(StoreSession& session, bool asJson) {
 
 }  // namespace
 
-void addMetrics(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("metrics", "List the metrics of a subscription, as the second tab does");
-  command->footer(
+void addMetrics(CommandLine& tool) {
+  Command command = tool.addCommand("metrics", "List the metrics of a subscription, as the second tab does");
+  command.setFooter(
       "One line for each metric, by technology, with the time it was last seen. The rows of \"RAT\" are always there,\n"
       "with the present time.");
   auto options = std::make_shared<StoreOptions>();
-  addStoreOptions(*command, *options, /*isTable=*/true);
-  command->callback([&chosen, options] {
-    chosen = [options] {
-      return withStore(*options, [&](StoreSession& session) { return listMetrics(session, options->asJson); });
-    };
+  addStoreOptions(command, *options, /*isTable=*/true);
+  command.setAction([options] {
+    return withStore(*options, [&](StoreSession& session) { return listMetrics(session, options->asJson); });
   });
 }
 

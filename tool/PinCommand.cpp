@@ -64,18 +64,15 @@ int pin(StoreSession& session, const Options& options) {
 
 }  // namespace
 
-void addPin(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("pin", "Put an attribute on the dashboard");
+void addPin(CommandLine& tool) {
+  Command command = tool.addCommand("pin", "Put an attribute on the dashboard");
   auto options = std::make_shared<Options>();
-  command->add_option("--tech", options->tech, "Technology, such as LTE")->required();
-  command->add_option("--metric", options->metric, "Metric, such as \"Serving Cell Info\"")->required();
-  command->add_option("--attribute", options->attribute, "Attribute as stored, such as dl_freq")->required();
-  addStoreOptions(*command, options->store, /*isTable=*/false);
-  command->callback([&chosen, options] {
-    chosen = [options] {
-      return withStore(options->store, [&](StoreSession& session) { return pin(session, *options); });
-    };
-  });
+  command.addOption("--tech", options->tech, "Technology, such as LTE").required();
+  command.addOption("--metric", options->metric, "Metric, such as \"Serving Cell Info\"").required();
+  command.addOption("--attribute", options->attribute, "Attribute as stored, such as dl_freq").required();
+  addStoreOptions(command, options->store, /*isTable=*/false);
+  command.setAction(
+      [options] { return withStore(options->store, [&](StoreSession& session) { return pin(session, *options); }); });
 }
 
 }  // namespace quorl::tool

@@ -16,7 +16,7 @@
 #include "CatalogueClass.h"
 #include "Commands.h"
 #include "Documents.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 #include "Player.h"
 #include "RowCounter.h"
 #include "TimeShift.h"
@@ -146,29 +146,29 @@ int replay(const Options& options) {
 
 }  // namespace
 
-void addReplay(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("replay", "Play recordings into a database");
-  command->footer(
+void addReplay(CommandLine& tool) {
+  Command command = tool.addCommand("replay", "Play recordings into a database");
+  command.setFooter(
       "Starts the product on a simulated phone, plays every event of the recordings in order, and prints one JSON\n"
       "summary. The rows are then in metricPartV11.sqlite in the documents directory. A line of a recording that is "
       "no\n"
       "event is reported and left out, and makes the exit code 1.");
   auto options = std::make_shared<Options>();
-  command->add_option("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")
-      ->required();
-  command->add_option("--documents", options->documents, "Directory for the database; made if it is missing")
-      ->required();
-  command->add_option("--device-class", options->deviceClass, "Device class, such as Tabrin");
-  command->add_flag("--internal-build", options->device.isInternalBuild, "Be an internal build");
-  command->add_flag("--carrier-build", options->device.isCarrierBuild, "Be a carrier build");
-  command->add_flag("--rebase-time", options->rebaseTime, "Move the times in the payloads so that the last is now");
-  command->add_option("--telephony", options->telephonyScript, "Telephony script to play beside the recordings");
-  command->add_flag("--verbose", options->isVerbose, "Show the log on standard error");
-  command->add_option("FILE", options->files, "Recordings, in the order of playing")->required();
-  command->callback([&chosen, options, command] {
+  command.addOption("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")
+      .required();
+  command.addOption("--documents", options->documents, "Directory for the database; made if it is missing").required();
+  const CommandOption deviceClass =
+      command.addOption("--device-class", options->deviceClass, "Device class, such as Tabrin");
+  command.addFlag("--internal-build", options->device.isInternalBuild, "Be an internal build");
+  command.addFlag("--carrier-build", options->device.isCarrierBuild, "Be a carrier build");
+  command.addFlag("--rebase-time", options->rebaseTime, "Move the times in the payloads so that the last is now");
+  command.addOption("--telephony", options->telephonyScript, "Telephony script to play beside the recordings");
+  command.addFlag("--verbose", options->isVerbose, "Show the log on standard error");
+  command.addOption("FILE", options->files, "Recordings, in the order of playing").required();
+  command.setAction([options, deviceClass] {
     options->device.chipset = options->chipset;
-    if (command->count("--device-class") > 0) options->device.deviceClass = options->deviceClass;
-    chosen = [options] { return replay(*options); };
+    if (deviceClass.isGiven()) options->device.deviceClass = options->deviceClass;
+    return replay(*options);
   });
 }
 

@@ -49,14 +49,14 @@ int printSchema(const std::optional<std::string>& className) {
 
 }  // namespace
 
-void addSchema(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("schema", "Print the message classes as Protocol Buffers schema");
-  command->footer(
+void addSchema(CommandLine& tool) {
+  Command command = tool.addCommand("schema", "Print the message classes as Protocol Buffers schema");
+  command.setFooter(
       "Prints plain .proto text that protoc compiles, so that any Protocol Buffers tool can read the payloads: all\n"
       "classes, or one with everything that it uses.");
   auto className = std::make_shared<std::optional<std::string>>();
-  command->add_option("--class", *className, "Message class, such as KCellularEmmContext");
-  command->callback([&chosen, className] { chosen = [className] { return printSchema(*className); }; });
+  command.addOption("--class", *className, "Message class, such as KCellularEmmContext");
+  command.setAction([className] { return printSchema(*className); });
 }
 
 }  // namespace quorl::tool

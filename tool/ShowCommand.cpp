@@ -5,7 +5,7 @@
 #include <fmt/format.h>
 
 #include "Commands.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 #include "StoreSession.h"
 #include "TextTable.h"
 #include "base/DateText.h"
@@ -37,16 +37,15 @@ void printJson(MetricDetailView& view) {
   for (const MetricDetailView::Section& section : view.sections()) {
     for (const auto& cell : section.cells) {
       const Metric& row = cell->metricObject();
-      Json line;
-      if (!section.header.empty()) line["section"] = section.header;
-      line["attribute"] = row.attributeNameNonLocalized;
-      line["name"] = cell->nameText();
-      line["value"] = cell->valueText();
-      line["type"] = row.attributeValueType;
-      line["collectedOn"] = wallClockText(row.collectedOn);
-      line["isBookmarked"] = cell->isBookmarked();
-      line["graphable"] = row.graphable;
-      std::cout << jsonLine(line) << '\n';
+      std::cout << jsonLine({{"section", section.header.empty() ? JsonValue() : JsonValue(section.header)},
+                             {"attribute", row.attributeNameNonLocalized},
+                             {"name", cell->nameText()},
+                             {"value", cell->valueText()},
+                             {"type", row.attributeValueType},
+                             {"collectedOn", wallClockText(row.collectedOn)},
+                             {"isBookmarked", cell->isBookmarked()},
+                             {"graphable", row.graphable}})
+                << '\n';
     }
   }
 }
@@ -67,18 +66,16 @@ int show(StoreSession& session, const Options& options) {
 
 }  // namespace
 
-void addShow(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("show", "Print the latest value of each attribute of a metric");
-  command->footer("Names and values are those that the detail screen shows; --json has the stored names beside them.");
+void addShow(CommandLine& tool) {
+  Command command = tool.addCommand("show", "Print the latest value of each attribute of a metric");
+  command.setFooter(
+      "Names and values are those that the detail screen shows; --json has the stored names beside them.");
   auto options = std::make_shared<Options>();
-  command->add_option("--tech", options->tech, "Technology, such as LTE")->required();
-  command->add_option("--metric", options->metric, "Metric, such as \"Serving Cell Info\"")->required();
-  addStoreOptions(*command, options->store, /*isTable=*/true);
-  command->callback([&chosen, options] {
-    chosen = [options] {
-      return withStore(options->store, [&](StoreSession& session) { return show(session, *options); });
-    };
-  });
+  command.addOption("--tech", options->tech, "Technology, such as LTE").required();
+  command.addOption("--metric", options->metric, "Metric, such as \"Serving Cell Info\"").required();
+  addStoreOptions(command, options->store, /*isTable=*/true);
+  command.setAction(
+      [options] { return withStore(options->store, [&](StoreSession& session) { return show(session, *options); }); });
 }
 
 }  // namespace quorl::tool

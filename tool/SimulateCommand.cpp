@@ -13,7 +13,7 @@
 
 #include "Commands.h"
 #include "Documents.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 #include "ProgressBar.h"
 #include "Simulation.h"
 #include "base/DateText.h"
@@ -140,39 +140,36 @@ int simulate(const Options& options) {
 
 }  // namespace
 
-void addSimulate(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("simulate", "Send a simulated phone through a scenario");
-  command->footer(
+void addSimulate(CommandLine& tool) {
+  Command command = tool.addCommand("simulate", "Send a simulated phone through a scenario");
+  command.setFooter(
       "Writes what its baseband manager delivers as a recording, or fills a database: with --history-days a past in\n"
       "which the product was looked at some times a day, written in bulk; with --minutes what the product itself "
       "makes\n"
       "of the way. The same scenario, seed and family give the same recording, byte for byte.");
   auto options = std::make_shared<Options>();
-  command->add_option("--scenario", options->scenario, "Name of a scenario that ships with it, or a file")->required();
-  command->add_option("--seed", options->seed, "Which of the scenario's runs")->capture_default_str();
-  command->add_option("--family", options->family, "Baseband family")
-      ->check(CLI::IsMember({"mav", "ice"}))
-      ->capture_default_str();
-  auto* minutes = command->add_option("--minutes", options->minutes, "Simulated minutes")
-                      ->check(CLI::Range(0.0, 60.0 * 24 * 31))
-                      ->capture_default_str();
-  command->add_option("--output", options->output, "Recording to write");
-  command->add_option("--start", options->start, "Wall-clock time at which a recording begins, yyyy-MM-dd HH:mm:ss");
-  command->add_option("--documents", options->documents, "Directory for a database; made if it is missing");
-  command->add_option("--history-days", options->historyDays, "Days of history before now")->check(CLI::Range(1, 31));
+  command.addOption("--scenario", options->scenario, "Name of a scenario that ships with it, or a file").required();
+  command.addOption("--seed", options->seed, "Which of the scenario's runs").showDefault();
+  command.addOption("--family", options->family, "Baseband family").oneOf({"mav", "ice"}).showDefault();
+  const CommandOption minutes =
+      command.addOption("--minutes", options->minutes, "Simulated minutes").within(0.0, 60.0 * 24 * 31).showDefault();
+  command.addOption("--output", options->output, "Recording to write");
+  command.addOption("--start", options->start, "Wall-clock time at which a recording begins, yyyy-MM-dd HH:mm:ss");
+  command.addOption("--documents", options->documents, "Directory for a database; made if it is missing");
+  command.addOption("--history-days", options->historyDays, "Days of history before now").within(1, 31);
   command
-      ->add_option("--sessions-per-day", options->sessionsPerDay, "How often a day of the history the product was used")
-      ->check(CLI::Range(1, 24))
-      ->capture_default_str();
-  command->add_option("--session-minutes", options->sessionMinutes, "For how long each time")
-      ->check(CLI::Range(0.1, 720.0))
-      ->capture_default_str();
-  command->add_option("--speed", options->speed, "Simulated seconds in a second; as fast as possible without it")
-      ->check(CLI::Range(0.001, 100000.0));
-  command->add_option("--record", options->record, "Recording of what the product was delivered");
-  command->callback([&chosen, options, minutes] {
-    options->hasMinutes = minutes->count() > 0;
-    chosen = [options] { return simulate(*options); };
+      .addOption("--sessions-per-day", options->sessionsPerDay, "How often a day of the history the product was used")
+      .within(1, 24)
+      .showDefault();
+  command.addOption("--session-minutes", options->sessionMinutes, "For how long each time")
+      .within(0.1, 720.0)
+      .showDefault();
+  command.addOption("--speed", options->speed, "Simulated seconds in a second; as fast as possible without it")
+      .within(0.001, 100000.0);
+  command.addOption("--record", options->record, "Recording of what the product was delivered");
+  command.setAction([options, minutes] {
+    options->hasMinutes = minutes.isGiven();
+    return simulate(*options);
   });
 }
 

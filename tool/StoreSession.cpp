@@ -23,15 +23,14 @@ simulator::SimulatedPhone::Options phoneOptions(const StoreOptions& options, std
 
 }  // namespace
 
-void addStoreOptions(CLI::App& command, StoreOptions& options, bool isTable) {
-  command.add_option("--documents", options.documents, "Documents directory that replay filled")->required();
-  command.add_option("--subscription", options.subscription, "Subscription to look at; 0 if not given")
-      ->check(CLI::IsMember({0, 1}));
-  command.add_option("--chipset", options.chipset, "Baseband chipset; that of the stored metrics if not given");
-  command.add_flag("--internal-build", options.isInternalBuild, "Be an internal build");
-  command.add_flag("--carrier-build", options.isCarrierBuild, "Be a carrier build");
-  command.add_flag("--verbose", options.isVerbose, "Show the log on standard error");
-  if (isTable) command.add_flag("--json", options.asJson, "Print one JSON object a line instead of a table");
+void addStoreOptions(Command& command, StoreOptions& options, bool isTable) {
+  command.addOption("--documents", options.documents, "Documents directory that replay filled").required();
+  command.addOption("--subscription", options.subscription, "Subscription to look at; 0 if not given").oneOf({0, 1});
+  command.addOption("--chipset", options.chipset, "Baseband chipset; that of the stored metrics if not given");
+  command.addFlag("--internal-build", options.isInternalBuild, "Be an internal build");
+  command.addFlag("--carrier-build", options.isCarrierBuild, "Be a carrier build");
+  command.addFlag("--verbose", options.isVerbose, "Show the log on standard error");
+  if (isTable) command.addFlag("--json", options.asJson, "Print one JSON object a line instead of a table");
 }
 
 tl::expected<StoreSession*, std::string> StoreSession::open(const StoreOptions& options) {

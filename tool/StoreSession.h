@@ -4,7 +4,6 @@
 #include <memory>
 #include <string>
 
-#include <CLI/CLI.hpp>
 #include <tl/expected.hpp>
 
 #include "Commands.h"
@@ -25,7 +24,7 @@ struct StoreOptions {
 };
 
 /// Adds the options to `command`, "--json" only if its result is a table. `options` must outlive the parsing.
-void addStoreOptions(CLI::App& command, StoreOptions& options, bool isTable);
+void addStoreOptions(Command& command, StoreOptions& options, bool isTable);
 
 /// The product's store on a database that is there already, on a phone without a baseband. Like every start of the
 /// product it drops the rows of thirty days ago and older. The product has no tear-down: a process opens one at most,

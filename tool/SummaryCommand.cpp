@@ -7,7 +7,7 @@
 
 #include "Commands.h"
 #include "Documents.h"
-#include "MessageJson.h"
+#include "JsonLine.h"
 
 namespace quorl::tool {
 namespace {
@@ -56,13 +56,13 @@ int printSummary(const Options& options) {
 
 }  // namespace
 
-void addSummary(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("summary", "Print what a database holds, metric by metric");
-  command->footer("One line for each metric: technology, metric, rows, and the time of the latest row.");
+void addSummary(CommandLine& tool) {
+  Command command = tool.addCommand("summary", "Print what a database holds, metric by metric");
+  command.setFooter("One line for each metric: technology, metric, rows, and the time of the latest row.");
   auto options = std::make_shared<Options>();
-  command->add_option("--documents", options->documents, "Documents directory that replay filled")->required();
-  command->add_flag("--json", options->asJson, "Print one JSON object a line instead of a table");
-  command->callback([&chosen, options] { chosen = [options] { return printSummary(*options); }; });
+  command.addOption("--documents", options->documents, "Documents directory that replay filled").required();
+  command.addFlag("--json", options->asJson, "Print one JSON object a line instead of a table");
+  command.setAction([options] { return printSummary(*options); });
 }
 
 }  // namespace quorl::tool

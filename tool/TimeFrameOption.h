@@ -3,17 +3,14 @@
 #include <string>
 #include <string_view>
 
-#include <CLI/CLI.hpp>
-
+#include "CommandLine.h"
 #include "store/Metric.h"
 
 namespace quorl::tool {
 
 /// Adds the required option "--time-frame", which takes daily, weekly or monthly.
-inline void addTimeFrameOption(CLI::App& command, std::string& name) {
-  command.add_option("--time-frame", name, "daily, weekly or monthly")
-      ->required()
-      ->check(CLI::IsMember({"daily", "weekly", "monthly"}));
+inline void addTimeFrameOption(Command& command, std::string& name) {
+  command.addOption("--time-frame", name, "daily, weekly or monthly").required().oneOf({"daily", "weekly", "monthly"});
 }
 
 /// The time frame of a name that the option has let pass.

@@ -54,17 +54,14 @@ int unpin(StoreSession& session, const Options& options) {
 
 }  // namespace
 
-void addUnpin(CLI::App& tool, Action& chosen) {
-  auto* command = tool.add_subcommand("unpin", "Take an attribute off the dashboard");
+void addUnpin(CommandLine& tool) {
+  Command command = tool.addCommand("unpin", "Take an attribute off the dashboard");
   auto options = std::make_shared<Options>();
-  command->add_option("--tech", options->tech, "Technology, such as LTE")->required();
-  command->add_option("--attribute", options->attribute, "Attribute as stored, such as dl_freq")->required();
-  addStoreOptions(*command, options->store, /*isTable=*/false);
-  command->callback([&chosen, options] {
-    chosen = [options] {
-      return withStore(options->store, [&](StoreSession& session) { return unpin(session, *options); });
-    };
-  });
+  command.addOption("--tech", options->tech, "Technology, such as LTE").required();
+  command.addOption("--attribute", options->attribute, "Attribute as stored, such as dl_freq").required();
+  addStoreOptions(command, options->store, /*isTable=*/false);
+  command.setAction(
+      [options] { return withStore(options->store, [&](StoreSession& session) { return unpin(session, *options); }); });
 }
 
 }  // namespace quorl::tool
