@@ -1,0 +1,2 @@
+// Stands for the headers that all test programs have compiled once; see this folder's CMakeLists.txt.
+int main() {}
