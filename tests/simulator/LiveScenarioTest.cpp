@@ -3,6 +3,7 @@
 #include <memory>
 #include <optional>
 #include <set>
+#include <sstream>
 #include <string>
 #include <utility>
 #include <vector>
@@ -198,6 +199,28 @@ TEST_F(LiveScenarioTest, StandsStillWhileThePhoneIsBehind) {
   time.advance(seconds(10));
   EXPECT_GT(last, before + 5000);
   EXPECT_LT(last, before + 15000) << "what it stood is not made up for";
+}
+
+TEST_F(LiveScenarioTest, ACaptureSeesAllThatTheBasebandDoes) {
+  const auto log = std::make_shared<BasebandLog>();
+  auto made = LiveScenario::make({city()}, {library, &telephony, time, *mainQueue, time, {}, log});
+  ASSERT_TRUE(made) << made.error();
+  scenario = *std::move(made);
+  driveOn(seconds(10));
+  log->open();
+  driveOn(seconds(30));
+  log->close();
+  driveOn(seconds(30));
+  std::istringstream captured(log->take(BasebandLog::kCapacity));
+  const Recording recording = readRecording(captured);
+  EXPECT_TRUE(recording.faults.empty());
+  std::set<std::int64_t> seen;
+  for (const RecordedEvent& event : recording.events) {
+    EXPECT_GE(event.atMs, 10000U);
+    EXPECT_LE(event.atMs, 40000U);
+    seen.insert(*event.metricID);
+  }
+  EXPECT_GT(seen.size(), 3U) << "though nobody subscribed to any";
 }
 
 TEST_F(LiveScenarioTest, RecordsWhatItDelivers) {

@@ -104,6 +104,10 @@ class SondrelSimulatorTest : public testing::Test {
     std::sort(names.begin(), names.end());
     return names;
   }
+  std::string contentOf(const char* name) const {
+    std::ifstream file(options.folder / name);
+    return {std::istreambuf_iterator<char>(file), {}};
+  }
 
   test::VirtualTime time;
   std::shared_ptr<test::SteppedQueue> main = time.makeStepped("main");
@@ -169,11 +173,50 @@ TEST_F(SondrelSimulatorTest, AChunkSaysWhatItIs) {
   launch();
   starts("RF and Power");
   passes(500ms);
-  std::ifstream file(options.folder / "000001-RF-and-Power.chunk");
-  const std::string content{std::istreambuf_iterator<char>(file), {}};
+  const std::string content = contentOf("000001-RF-and-Power.chunk");
   EXPECT_THAT(content, testing::StartsWith("simulated baseband log\nconfiguration: RF and Power\nchunk: 1\n"
                                            "begun: 2026-01-05 09:30:12 +0000\n"));
   EXPECT_EQ(content.size(), 32U * 1024);
+}
+
+TEST_F(SondrelSimulatorTest, AChunkHoldsWhatTheBasebandDidMeanwhile) {
+  options.log = std::make_shared<BasebandLog>();
+  launch();
+  options.log->add("before the capture");
+  starts("Default", 1);
+  options.log->add("first");
+  options.log->add("second");
+  passes(500ms);
+  options.log->add(std::string(900, 'x'));
+  options.log->add(std::string(200, 'y'));
+  passes(500ms);
+  passes(500ms);
+  const auto logOf = [this](const char* name) {
+    const std::string content = contentOf(name);
+    EXPECT_EQ(content.size(), 1024U);
+    const std::size_t begin = content.find("+0000\n") + 6;
+    return content.substr(begin, content.find('\0') - begin);
+  };
+  EXPECT_EQ(logOf("000001-Default.chunk"), "first\nsecond\n");
+  EXPECT_EQ(logOf("000002-Default.chunk"), std::string(900, 'x') + "\n") << "what has no room waits for the next";
+  EXPECT_EQ(logOf("000003-Default.chunk"), std::string(200, 'y') + "\n");
+  stops();
+  EXPECT_FALSE(options.log->isOpen()) << "nothing is kept for nobody";
+}
+
+TEST(BasebandLogTest, WhatWaitsTooLongGoesOldestFirst) {
+  BasebandLog log;
+  log.add("closed");
+  EXPECT_EQ(log.take(100), "");
+  log.open();
+  log.add("oldest");
+  log.add(std::string(BasebandLog::kCapacity - 3, 'x'));
+  log.add("n");
+  EXPECT_EQ(log.take(10), std::string(10, 'x')) << "a line that is too long comes cut";
+  EXPECT_EQ(log.take(10), "n\n");
+  log.add("left over");
+  log.open();
+  EXPECT_EQ(log.take(100), "");
 }
 
 TEST_F(SondrelSimulatorTest, KeepsTheNewestFilesUpToTheMaximum) {

@@ -15,12 +15,6 @@ namespace {
 constexpr std::size_t kMostTasks = 400;
 constexpr std::chrono::seconds kLongestRest{2};
 
-simulator::SondrelSimulator::Options captureOptions(const std::filesystem::path& documents) {
-  simulator::SondrelSimulator::Options options;
-  options.folder = documents / "Sondrel";
-  return options;
-}
-
 }  // namespace
 
 SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents)
@@ -35,7 +29,7 @@ SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const st
       strings_(resourceFolders_),
       console_(/*isShown=*/false),
       telephony_(queues_),
-      sondrel_(captureOptions(documents), mainQueue_, queues_, clock_),
+      sondrel_(simulator::SondrelSimulator::ofPhone(documents, log_), mainQueue_, queues_, clock_),
       platform_{mainQueue_,  *backgroundQueue_, queues_,    clock_,   device_,    resources_,
                 documents_,  strings_,          console_,   alerts_,  analytics_, view::SaveText::shared(),
                 pasteboard_, baseband_,         telephony_, &sondrel_} {
@@ -57,7 +51,7 @@ tl::expected<void, std::string> SimulatedDesktop::tuneIn(Programme programme) {
     auto made =
         simulator::LiveScenario::make({*std::move(programme.scenario), programme.speed, std::move(programme.record)},
                                       {baseband_, hasScript ? nullptr : &telephony_, queues_, mainQueue_, clock_,
-                                       [activity = activity_] { return activity->count() > kMostTasks; }});
+                                       [activity = activity_] { return activity->count() > kMostTasks; }, log_});
     if (!made) return tl::unexpected(std::move(made.error()));
     scenario_ = *std::move(made);
     scenario_->advance(std::chrono::milliseconds(1));

@@ -68,6 +68,7 @@ class SimulatedDesktop {
   QtPasteboard pasteboard_;
   simulator::BasebandManager baseband_;
   simulator::TelephonySimulator telephony_;
+  const std::shared_ptr<simulator::BasebandLog> log_ = std::make_shared<simulator::BasebandLog>();
   simulator::SondrelSimulator sondrel_;
   Platform platform_;
   std::unique_ptr<simulator::LiveScenario> scenario_;

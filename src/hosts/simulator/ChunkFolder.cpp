@@ -47,11 +47,11 @@ std::string inFileName(std::string text) {
   return text;
 }
 
-/// A new file with `head` at its beginning and a hole up to `bytes`. Answers 0 or the error's code.
-int writeSparse(const fs::path& path, std::string_view head, std::uint64_t bytes) {
+/// A new file with `text` at its beginning and a hole up to `bytes`. Answers 0 or the error's code.
+int writeSparse(const fs::path& path, std::string_view text, std::uint64_t bytes) {
   const int file = ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, S_IRUSR | S_IWUSR);
   if (file < 0) return errno;
-  const std::string_view kept = head.substr(0, bytes);
+  const std::string_view kept = text.substr(0, bytes);
   int code = 0;
   if (::write(file, kept.data(), kept.size()) != static_cast<ssize_t>(kept.size()) ||
       ::ftruncate(file, static_cast<off_t>(bytes)) != 0)
@@ -89,14 +89,16 @@ tl::expected<void, SondrelError> ChunkFolder::open() {
 }
 
 tl::expected<SondrelFileInformation, SondrelError> ChunkFolder::write(const std::string& configuration,
-                                                                      std::uint64_t bytes, Date date) {
+                                                                      std::uint64_t bytes, Date date,
+                                                                      const Content& content) {
   if (usedBytes_ + bytes > capacity_) return cannotWrite(ENOSPC);
   const std::uint64_t number = lastNumber_ + 1;
   const std::string name = fmt::format("{:06}-{}{}", number, inFileName(configuration), kExtension);
-  const std::string head = fmt::format("simulated baseband log\nconfiguration: {}\nchunk: {}\nbegun: {}\n",
-                                       configuration, number, utcText(date));
+  std::string text = fmt::format("simulated baseband log\nconfiguration: {}\nchunk: {}\nbegun: {}\n", configuration,
+                                 number, utcText(date));
   const fs::path path = folder_ / name;
-  if (const int code = writeSparse(path, head, bytes); code != 0) return cannotWrite(code);
+  if (text.size() < bytes) text += content(bytes - text.size());
+  if (const int code = writeSparse(path, text, bytes); code != 0) return cannotWrite(code);
   lastNumber_ = number;
   chunks_.push_back({number, path, bytes});
   usedBytes_ += bytes;

@@ -31,6 +31,7 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
         mainQueue_(surroundings.mainQueue),
         clock_(surroundings.clock),
         isBehind_(surroundings.isBehind),
+        log_(surroundings.log),
         queue_(surroundings.queues.makeSerialQueue("modem")),
         telephony_(surroundings.telephony != nullptr ? std::optional<TelephonyFeed>(*surroundings.telephony)
                                                      : std::nullopt),
@@ -59,6 +60,7 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
     run_.advance(
         duration,
         [this](const RecordedEvent& event) {
+          if (log_ && log_->isOpen()) log_->add(recordingLine(event));
           if (baseband_.deliverSelected(event.message())) delivered(event);
         },
         [this](const network::ModemEvent& event, const network::SubscriptionState& state) {
@@ -120,6 +122,7 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
   Queue& mainQueue_;
   const Clock& clock_;
   const std::function<bool()> isBehind_;
+  const std::shared_ptr<BasebandLog> log_;
   const std::shared_ptr<Queue> queue_;
   std::atomic<std::uint64_t> events_{0};
   // On the queue alone.

@@ -12,6 +12,7 @@
 
 #include "base/Clock.h"
 #include "base/Queue.h"
+#include "hosts/simulator/BasebandLog.h"
 #include "hosts/simulator/BasebandManager.h"
 #include "hosts/simulator/RecordingWriter.h"
 #include "hosts/simulator/ScenarioRun.h"
@@ -39,6 +40,9 @@ class LiveScenario {
     const Clock& clock;
     /// Whether the phone has more to do than it gets done. Asked on the modem's queue; empty: it never has.
     std::function<bool()> isBehind{};
+    /// Takes all that the baseband measures and meets, whatever is delivered of it, as lines of a recording; may be
+    /// null.
+    std::shared_ptr<BasebandLog> log{};
   };
   using Observer = ScenarioRun::Observer;
 

@@ -23,9 +23,7 @@ SimulatedPhone::SimulatedPhone(Options options)
       platform_{mainQueue_, *backgroundQueue_, queues_,    clock_, device_,     resources_, documents_, strings_,
                 console_,   alerts_,           analytics_, share_, pasteboard_, baseband_,  telephony_} {
   if (device_.hasClass("Sondrel")) {
-    SondrelSimulator::Options capture;
-    capture.folder = options.documents / "Sondrel";
-    sondrel_.emplace(std::move(capture), mainQueue_, queues_, clock_);
+    sondrel_.emplace(SondrelSimulator::ofPhone(options.documents, log_), mainQueue_, queues_, clock_);
     platform_.sondrel = &*sondrel_;
   }
   Platform::install(&platform_);
@@ -36,7 +34,7 @@ SimulatedPhone::~SimulatedPhone() {
 }
 
 tl::expected<LiveScenario*, std::string> SimulatedPhone::live(LiveScenario::Options options) {
-  auto made = LiveScenario::make(std::move(options), {baseband_, &telephony_, queues_, mainQueue_, clock_});
+  auto made = LiveScenario::make(std::move(options), {baseband_, &telephony_, queues_, mainQueue_, clock_, {}, log_});
   if (!made) return tl::unexpected(std::move(made.error()));
   scenario_ = *std::move(made);
   return scenario_.get();

@@ -72,6 +72,7 @@ class SimulatedPhone {
   KeptPasteboard pasteboard_;
   BasebandManager baseband_;
   TelephonySimulator telephony_;
+  const std::shared_ptr<BasebandLog> log_ = std::make_shared<BasebandLog>();
   std::optional<SondrelSimulator> sondrel_;  // where the device has such a class
   Platform platform_;
   std::unique_ptr<LiveScenario> scenario_;

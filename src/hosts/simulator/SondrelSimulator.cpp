@@ -39,11 +39,12 @@ class SondrelSimulator::Capture {
     reportBatch();
     if (const auto fault = faultOf(configuration)) return tellError({*fault});
     if (const auto opened = folder_.open(); !opened) {
-      timer_.reset();
+      end();
       return tellError(opened.error());
     }
     configuration_ = configuration;
     timer_.reset();
+    if (options_.log) options_.log->open();
     timer_.emplace(worker_, options_.chunkInterval, [this] { writeChunk(); });
     tell([configuration](SondrelDelegate& delegate) {
       delegate.didStateChanged(sondrel_state::kStarted, std::nullopt, configuration);
@@ -53,7 +54,7 @@ class SondrelSimulator::Capture {
   void stop() {
     if (!timer_) return;
     reportBatch();
-    timer_.reset();
+    end();
     tellStopped();
   }
 
@@ -69,6 +70,11 @@ class SondrelSimulator::Capture {
   }
 
  private:
+  void end() {
+    timer_.reset();
+    if (options_.log) options_.log->close();
+  }
+
   std::optional<std::string> faultOf(const SondrelConfiguration& configuration) const {
     const std::string name = configuration.activeConfig().value_or("");
     const auto& known = options_.configurations;
@@ -84,10 +90,12 @@ class SondrelSimulator::Capture {
   void writeChunk() {
     const auto bytes = static_cast<std::uint64_t>(configuration_.chunkFileSize().value_or(0) * kBytesPerUnit);
     const double count = std::min(configuration_.maxNumberOfLogs().value_or(0), 1e9);
-    const auto file = folder_.write(configuration_.activeConfig().value_or(""), bytes, clock_.now());
+    const auto file =
+        folder_.write(configuration_.activeConfig().value_or(""), bytes, clock_.now(),
+                      [this](std::size_t most) { return options_.log ? options_.log->take(most) : std::string(); });
     if (!file) {
       reportBatch();
-      timer_.reset();
+      end();
       tell([error = file.error()](SondrelDelegate& delegate) { delegate.didCollectLogs(std::nullopt, error); });
       tellStopped();
       return;
@@ -167,6 +175,14 @@ class SondrelSimulator::Library final : public Sondrel {
 
 std::vector<std::string> SondrelSimulator::defaultConfigurations() {
   return {"Default", "Voice", "Data Throughput", "Mobility", "Registration", "RF and Power", "Everything"};
+}
+
+SondrelSimulator::Options SondrelSimulator::ofPhone(const std::filesystem::path& documents,
+                                                    std::shared_ptr<BasebandLog> log) {
+  Options options;
+  options.folder = documents / "Sondrel";
+  options.log = std::move(log);
+  return options;
 }
 
 SondrelSimulator::SondrelSimulator(Options options, Queue& mainQueue, QueueFactory& queues, const Clock& clock)

@@ -11,14 +11,15 @@
 
 #include "base/Clock.h"
 #include "base/Queue.h"
+#include "hosts/simulator/BasebandLog.h"
 #include "platform/SondrelLibrary.h"
 
 namespace quorl::simulator {
 
 /// A log-capture library that exists only in software. While a capture runs it writes one chunk file at a time into a
 /// folder and reports the files in batches. The folder is a ring: beyond the capture's highest number of files the
-/// oldest goes, files of earlier runs included. A chunk has its full size but takes one block of the disk, so that the
-/// folder takes 32 MB at the most that the product asks for.
+/// oldest goes, files of earlier runs included. A chunk has its full size, begins with what the baseband did since the
+/// one before, and takes no room on the disk for the rest.
 ///
 /// - A start while a capture runs goes on with the new settings. What waits for its batch is reported first.
 /// - A stop reports what waits for its batch, then the state. Without a capture it says nothing.
@@ -37,9 +38,13 @@ class SondrelSimulator final : public SondrelFactory {
     std::size_t chunksPerBatch = 4;
     std::uint64_t capacity = std::numeric_limits<std::uint64_t>::max();  // bytes until the disk counts as full
     std::vector<std::string> configurations = defaultConfigurations();
+    /// What is captured; null: nothing but the heads of chunks.
+    std::shared_ptr<BasebandLog> log{};
   };
 
   static std::vector<std::string> defaultConfigurations();
+  /// Where a simulated phone keeps its chunks, and whose doings are in them.
+  static Options ofPhone(const std::filesystem::path& documents, std::shared_ptr<BasebandLog> log);
 
   /// The main queue and the clock must outlive it and what it makes.
   SondrelSimulator(Options options, Queue& mainQueue, QueueFactory& queues, const Clock& clock);
