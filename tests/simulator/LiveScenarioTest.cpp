@@ -17,6 +17,8 @@
 #include "hosts/simulator/history/BulkIntake.h"
 #include "hosts/simulator/history/History.h"
 #include "intake/ZelkorWrapper.h"
+#include "messages/MessageTable.h"
+#include "messages/MetricCodable.h"
 #include "store/PersistanceStore.h"
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
@@ -33,6 +35,8 @@ using std::chrono::seconds;
 ScenarioChoice city(std::uint64_t seed = 1) {
   return {findScenario("city", {QUORL_SOURCE_DIR "/resources"}).value(), seed, metrics::Family::Mav};
 }
+
+constexpr std::int64_t kServingCellInfo = 803010;
 
 /// A phone in the city with a client of its baseband manager, on virtual time.
 class LiveScenarioTest : public testing::Test {
@@ -149,6 +153,43 @@ TEST_F(LiveScenarioTest, TimePassesWithTheClockByTheSpeed) {
   const auto stopped = last;
   time.advance(seconds(60));
   EXPECT_EQ(last, stopped);
+}
+
+TEST_F(LiveScenarioTest, MetricsBearTheTimeAtWhichTheyCome) {
+  const auto log = std::make_shared<BasebandLog>();
+  bool isBehind = false;
+  auto made = LiveScenario::make({city(), 20},
+                                 {library, &telephony, time, *mainQueue, time, [&isBehind] { return isBehind; }, log});
+  ASSERT_TRUE(made) << made.error();
+  scenario = *std::move(made);
+  log->open();
+  const auto comesNow = [&] {
+    time.advance(seconds(5));
+    std::istringstream lines(log->take(BasebandLog::kCapacity));
+    const auto now = std::chrono::duration_cast<milliseconds>(time.now().time_since_epoch()).count();
+    int count = 0;
+    for (const RecordedEvent& event : readRecording(lines).events) {
+      if (event.metricID != kServingCellInfo) continue;
+      const auto message = makeMessage("CellularLteScellInfo");
+      message->initWithData(event.payload);
+      const auto timestamp = message->dictionaryRepresentation()->find("timestamp")->integer().value();
+      ++count;
+      EXPECT_LE(timestamp, now);
+      EXPECT_GE(timestamp, now - 5100);
+    }
+    EXPECT_GT(count, 0);
+  };
+  scenario->start();
+  comesNow();
+  comesNow();
+  isBehind = true;
+  time.advance(seconds(100));
+  isBehind = false;
+  comesNow();
+  time.setNow(time.now() - std::chrono::hours(2));
+  time.advance(seconds(1));
+  log->open();
+  comesNow();
 }
 
 TEST_F(LiveScenarioTest, AClockThatJumpsMovesTheWorldByASecondAtMost) {

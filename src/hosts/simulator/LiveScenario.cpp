@@ -107,8 +107,10 @@ class LiveScenario::Core : public std::enable_shared_from_this<Core> {
     if (!isRunning_) return;
     const Date now = clock_.now();
     const double passedMs = std::chrono::duration<double, std::milli>(now - last_).count();
-    last_ = now;
+    const Date before = std::exchange(last_, now);
     if (isBehind_ && isBehind_()) return planStep();
+    // Metrics bear the time of day at which they come, whatever the speed and however long the world stood still.
+    run_.keepTime(millisecondsSince1970(before), speed_);
     owedMs_ += std::clamp(passedMs, 0.0, kLongestStepMs) * speed_;
     const double whole = std::floor(owedMs_);
     owedMs_ -= whole;

@@ -27,6 +27,8 @@ class ScenarioRun {
 
   /// `startMs`: the time since 1970 at which the run begins, for the times in the payloads.
   ScenarioRun(ScenarioChoice choice, std::uint64_t startMs);
+  /// It is so many ms since 1970 now, and simulated time passes `speed` times as fast as the times in payloads.
+  void keepTime(std::uint64_t sinceEpochMs, double speed) { reporter_.keepTime({sinceEpochMs, nowMs(), speed}); }
 
   /// Lets this much simulated time pass. `atMs` of an event counts from the start of the run. `observer` sees every
   /// event of the modem before its metrics are made; it may be empty.

@@ -33,15 +33,14 @@ std::vector<MetricKind> kindsOf(Family family) {
   return kinds;
 }
 
-MetricReporter::MetricReporter(Family family, std::uint64_t salt, std::uint64_t startMs)
-    : salt_(salt), startMs_(startMs) {
+MetricReporter::MetricReporter(Family family, std::uint64_t salt, std::uint64_t startMs) : salt_(salt), time_{startMs} {
   for (const MetricKind& kind : kindsOf(family)) tracked_.push_back({kind, {}, {}});
 }
 
 void MetricReporter::report(Tracked& tracked, const SubscriptionState& state, network::SimulatedMs nowMs,
                             const network::ModemEventBody* event, const Sink& sink) {
   const std::size_t slot = state.subscription;
-  const Moment moment{state, event, startMs_ + nowMs, salt_, &tracked.baseline[slot]};
+  const Moment moment{state, event, time_.at(nowMs), salt_, &tracked.baseline[slot]};
   std::optional<ByteString> payload = tracked.kind.make(moment);
   if (!payload) return;
   tracked.lastMs[slot] = nowMs + 1;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <array>
+#include <cmath>
 #include <cstdint>
 #include <functional>
 #include <span>
@@ -22,6 +23,18 @@ struct ReportedMetric {
   ByteString payload;
 };
 
+/// Which time of day a modem's time is.
+struct TimeOfDay {
+  std::uint64_t sinceEpochMs = 0;  // at `modemMs`
+  network::SimulatedMs modemMs = 0;
+  double speed = 1;  // of the modem's time, more than 0
+
+  std::uint64_t at(network::SimulatedMs nowMs) const {
+    const double passed = static_cast<double>(nowMs) - static_cast<double>(modemMs);
+    return sinceEpochMs + static_cast<std::uint64_t>(std::llround(passed / speed));
+  }
+};
+
 /// Makes metrics of what happens in a modem: for each event those that it calls for, in the order of the family's
 /// kinds, and on a query those that have a value now.
 ///
@@ -32,6 +45,8 @@ class MetricReporter {
 
   /// `startMs` is the time since 1970 at which the modem's time 0 lies.
   MetricReporter(Family family, std::uint64_t salt, std::uint64_t startMs);
+  /// The times in payloads are such from now on.
+  void keepTime(const TimeOfDay& time) { time_ = time; }
 
   /// What the event calls for. `state` is its subscription's, right after it.
   void take(const network::ModemEvent& event, const network::SubscriptionState& state, const Sink& sink);
@@ -52,7 +67,7 @@ class MetricReporter {
   void obey(const network::event::Cue& cue, network::SimulatedMs nowMs, const Sink& sink) const;
 
   const std::uint64_t salt_;
-  const std::uint64_t startMs_;
+  TimeOfDay time_;
   std::vector<Tracked> tracked_;
   ReportedMetric last_;  // what a damaged payload is made from
 };
