@@ -12,30 +12,14 @@
 #include "app/AppDelegate.h"
 #include "app/ApplicationLoop.h"
 #include "base/NotificationCenter.h"
+#include "faults/NasEvent.h"
 #include "hosts/simulator/SimulatedPhone.h"
-#include "messages/classes/nas_context.h"
-#include "messages/wire/WireWriter.h"
 #include "shell/NotificationNames.h"
 #include "store/Metric.h"
 
 namespace {
 
 using namespace quorl;
-
-constexpr std::int64_t kNasMetricId = 3986700;
-
-zelkor::KeyValueMessage event(std::uint64_t timestampMs) {
-  KCellularEmmContext message;
-  message.setTimestamp(timestampMs);
-  message.setRegStatus(0);
-  message.setSubsId(0);
-  WireWriter writer;
-  message.writeTo(writer);
-  zelkor::KeyValueMessage event;
-  event.set(zelkor::kKeyMetricID, kNasMetricId);
-  event.set(zelkor::kKeyPayload, ByteString(writer.bytes()));
-  return event;
-}
 
 void report(const Notification& news) {
   const auto* row = news.entry<Metric>(notification::kMetricObjectKey);
@@ -63,7 +47,7 @@ int main(int argc, char** argv) {
   lifecycle.launch();
   for (;;) {
     for (int i = 0; i < 20; ++i)
-      if (!phone.baseband().deliver(zelkor::kEventMetric, event(timestampMs++))) return 1;
+      if (!phone.baseband().deliver(zelkor::kEventMetric, test::nasEvent(timestampMs++))) return 1;
     phone.runUntilAtRest();
   }
 }
