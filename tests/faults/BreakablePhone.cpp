@@ -1,5 +1,6 @@
 #include "faults/BreakablePhone.h"
 
+#include <cstdio>
 #include <fstream>
 #include <iterator>
 #include <utility>
@@ -101,6 +102,10 @@ void BreakablePhone::metricsArrive(std::size_t count, std::chrono::milliseconds 
 std::size_t BreakablePhone::storedRows() const {
   return static_cast<std::size_t>(
       std::stoul(RawDatabase(file()).column("SELECT count(*) FROM Metric WHERE metric_id = '3986700'").at(0)));
+}
+
+void figure(std::string_view what, std::size_t value) {
+  std::printf("    %.*s: %zu\n", static_cast<int>(what.size()), what.data(), value);
 }
 
 std::string contentOf(const std::filesystem::path& file) {

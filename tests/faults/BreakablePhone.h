@@ -138,6 +138,9 @@ class BreakablePhone {
   NotificationCenter::Observation observation_;
 };
 
+/// Prints a figure of the test at hand, for docs/reliability.md.
+void figure(std::string_view what, std::size_t value);
+
 /// What a file holds.
 std::string contentOf(const std::filesystem::path& file);
 

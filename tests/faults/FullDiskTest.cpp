@@ -77,6 +77,8 @@ TEST(FullDisk, CostsTheRowsOfThatTimeAloneAndIsTold) {
                                 "full\"))"),
             phone.lostRows());
   EXPECT_EQ(phone.integrity(), "ok");
+  figure("rows stored", phone.reportedRows);
+  figure("rows lost, each told", phone.lostRows());
   phone.ends();
   phone.launch();
   EXPECT_EQ(phone.storedRows(), phone.reportedRows) << "after a restart";

@@ -99,12 +99,16 @@ TEST_F(UnusableDatabase, WhereverItIsCutOffTheProgramRunsOnAndCutsNothingMore) {
     }
   }
   EXPECT_GT(refused, 20);
+  figure("cuts", 30);
+  figure("files refused and left as they were", static_cast<std::size_t>(refused));
 }
 
 TEST_F(UnusableDatabase, WhateverIsWrongInItTheProgramRunsOn) {
   hasBeenUsed(40);
   const std::string whole = contentOf(phone.file());
   std::mt19937 random(2);
+  std::size_t lost = 0;
+  const std::size_t reportedBefore = phone.reportedRows;
   for (int damage = 0; damage < 60; ++damage) {
     std::string content = whole;
     for (std::size_t octets = 1 + random() % 40; octets > 0; --octets)
@@ -114,7 +118,11 @@ TEST_F(UnusableDatabase, WhateverIsWrongInItTheProgramRunsOn) {
     const std::size_t reported = phone.reportedRows;
     isUsed();
     EXPECT_EQ(phone.reportedRows - reported + phone.lostRows(), 5 * kRowsOfNasEvent) << "of damage " << damage;
+    lost += phone.lostRows();
   }
+  figure("damaged files", 60);
+  figure("rows stored in them", phone.reportedRows - reportedBefore);
+  figure("rows lost, each told", lost);
 }
 
 TEST_F(UnusableDatabase, AJournalThatIsCutOffCostsWhatCameAfterTheCut) {

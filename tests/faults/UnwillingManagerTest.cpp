@@ -1,3 +1,4 @@
+#include <ctime>
 #include <optional>
 #include <string>
 
@@ -13,6 +14,15 @@ using std::chrono::hours;
 using std::chrono::seconds;
 
 constexpr char kAddRefused[] = "-[ZelkorWrapper addVexilConfigForAppId:andProtofFilePath:]: error=16 msg=resource busy";
+
+/// The processor's time.
+class Stopwatch {
+ public:
+  std::size_t ms() const { return static_cast<std::size_t>((std::clock() - begun_) * 1000 / CLOCKS_PER_SEC); }
+
+ private:
+  const std::clock_t begun_ = std::clock();
+};
 
 class UnwillingManagerTest : public testing::Test {
  protected:
@@ -93,8 +103,10 @@ TEST_F(UnwillingManagerTest, AHundredThousandMetricsAtOnceBecomeRowsInTheirOrder
   constexpr std::uint64_t kMetrics = 100'000;
   constexpr std::uint64_t kFirstMs = 1767605412000;
   phone.launch();
+  const Stopwatch watch;
   for (std::uint64_t i = 0; i < kMetrics; ++i) ASSERT_TRUE(phone.deliver(nasEvent(kFirstMs + i, /*hasStatus=*/false)));
   phone.host.time.settle();
+  figure("ms of the processor until all rows are stored", watch.ms());
   EXPECT_EQ(phone.reportedRows, kMetrics * 2);
   EXPECT_EQ(phone.lostRows(), 0U);
   RawDatabase database(phone.file());
@@ -123,7 +135,9 @@ class HugePayload : public UnwillingManagerTest {
     phone.launch();
     EXPECT_GE(payload.size(), kHuge);
     const std::size_t before = phone.reportedRows;
+    const Stopwatch watch;
     phone.metricArrives(event(metricId, std::move(payload)));
+    figure("ms of the processor for the metric", watch.ms());
     const std::size_t rows = phone.reportedRows - before;
     phone.metricsArrive(1);
     EXPECT_EQ(phone.reportedRows, before + rows + kRowsOfNasEvent);
