@@ -11,8 +11,8 @@ namespace quorl::simulator::network {
 /// and the supervision of the radio link (TS 36.331 5.3.11).
 class Mobility final : public RadioUser {
  public:
-  Mobility(SubscriptionCore& core, Camping& camping, Connection& connection)
-      : core_(core), camping_(camping), connection_(connection) {}
+  Mobility(SubscriptionCore& core, Connection& connection)
+      : core_(core), connection_(connection) {}
 
   /// A round of measurements in a connection.
   void measured();
@@ -39,7 +39,6 @@ class Mobility final : public RadioUser {
   SimulatedMs timeToTrigger(event::HandoverTrigger trigger) const;
 
   SubscriptionCore& core_;
-  Camping& camping_;
   Connection& connection_;
   std::vector<Candidate> candidates_;
   event::Handover pending_;  // reported; `to` null: none

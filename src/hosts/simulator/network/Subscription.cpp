@@ -16,7 +16,7 @@ Subscription::Subscription(std::uint8_t number, const Scenario& scenario, const 
     : core_(number, scenario, network, field, phone, seed, std::move(outlet)),
       camping_(core_),
       connection_(core_, camping_),
-      mobility_(core_, camping_, connection_),
+      mobility_(core_, connection_),
       carriers_(core_, connection_),
       registration_(core_, camping_, connection_),
       data_(core_, connection_),
