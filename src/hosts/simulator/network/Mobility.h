@@ -11,8 +11,7 @@ namespace quorl::simulator::network {
 /// and the supervision of the radio link (TS 36.331 5.3.11).
 class Mobility final : public RadioUser {
  public:
-  Mobility(SubscriptionCore& core, Connection& connection)
-      : core_(core), connection_(connection) {}
+  Mobility(SubscriptionCore& core, Connection& connection) : core_(core), connection_(connection) {}
 
   /// A round of measurements in a connection.
   void measured();
