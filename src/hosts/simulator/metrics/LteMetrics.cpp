@@ -241,11 +241,11 @@ constexpr MetricKind kKinds[] = {
      on<event::ServingCellChanged, event::Measured>(),
      servingCell,
      /*isCurrent=*/true,
-     {30000, 5000}},
+     {30000, 600}},
     {803011, on<event::AirMessage>(), otaMsg},
     {803104, on<event::RachAttempt>(), rachAttempt},
     {806674, on<event::Measured>(), stateHistory, /*isCurrent=*/true, {120000, 60000}, /*counts=*/true},
-    {806660, on<event::Measured>(), levelHistogram, /*isCurrent=*/true, {20000, 2000}, /*counts=*/true},
+    {806660, on<event::Measured>(), levelHistogram, /*isCurrent=*/true, {20000, 200}, /*counts=*/true},
     {806743, on<event::ConnectionEnded>(), connectionStats},
 };
 

@@ -179,7 +179,7 @@ constexpr MetricKind kKinds[] = {
      on<event::ServingCellChanged, event::SecondaryGroupAdded, event::Measured>(),
      servingCell,
      /*isCurrent=*/true,
-     {30000, 5000}},
+     {30000, 600}},
     {806915, on<event::RachAttempt>(), rachAttempt},
     {806922, on<event::BeamSwitched>(), beamSwitch},
 };

@@ -306,7 +306,7 @@ constexpr MetricKind kKinds[] = {
      on<event::Measured>(),
      uplinkPdcp,
      /*isCurrent=*/true,
-     {60000, 2000},
+     {60000, 200},
      /*counts=*/true},
     {806933, on<event::SecondaryGroupRemoved>(), endcUsage},
     {806934, on<event::ConnectionEnded>(), connectionStats},
