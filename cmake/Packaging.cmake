@@ -45,6 +45,15 @@ if(TARGET quorl-simulator)
           DESTINATION ${CMAKE_INSTALL_DATADIR}/icons/hicolor/scalable/apps)
 endif()
 
+if(QUORL_TESTS AND TARGET quorl-simulator)
+  find_program(DESKTOP_FILE_VALIDATE desktop-file-validate REQUIRED)
+  find_program(APPSTREAMCLI appstreamcli REQUIRED)
+  add_test(NAME desktop_entry
+           COMMAND ${DESKTOP_FILE_VALIDATE} --no-hints ${PROJECT_SOURCE_DIR}/packaging/com.ardent.quorl.desktop)
+  add_test(NAME appstream_metadata
+           COMMAND ${APPSTREAMCLI} validate --no-net ${CMAKE_BINARY_DIR}/packaging/com.ardent.quorl.metainfo.xml)
+endif()
+
 set(CPACK_GENERATOR DEB)
 set(CPACK_PACKAGE_NAME quorl)
 set(CPACK_PACKAGE_VENDOR "The Quorl developers")
