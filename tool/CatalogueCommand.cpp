@@ -3,9 +3,9 @@
 
 #include <fmt/format.h>
 
-#include "CatalogueClass.h"
 #include "Commands.h"
 #include "JsonLine.h"
+#include "hosts/simulator/CatalogueClass.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MetricCodable.h"
 
@@ -20,7 +20,7 @@ int printCatalogue() {
                            {"hex", fmt::format("{:2X}", row.zelkorId)},
                            {"className", row.className},
                            {"deviceType", row.deviceType},
-                           {"decodable", makeMessage(decodingClass(row)) != nullptr}})
+                           {"decodable", makeMessage(simulator::decodingClass(row)) != nullptr}})
               << '\n';
   }
   return kSuccess;

@@ -13,18 +13,18 @@
 
 #include <fmt/format.h>
 
-#include "CatalogueClass.h"
 #include "Commands.h"
 #include "Documents.h"
 #include "JsonLine.h"
 #include "Player.h"
 #include "RowCounter.h"
-#include "TimeShift.h"
 #include "ToolLog.h"
 #include "app/AppDelegate.h"
 #include "app/ApplicationLoop.h"
+#include "hosts/simulator/CatalogueClass.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/SimulatedPhone.h"
+#include "hosts/simulator/TimeShift.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MetricCodable.h"
 
@@ -72,7 +72,7 @@ std::optional<std::vector<RecordedEvent>> readAll(const std::vector<std::string>
 }
 
 bool isReadable(const RecordedEvent& event, const MetricGroupV2& row) {
-  const auto message = makeMessage(decodingClass(row));
+  const auto message = makeMessage(simulator::decodingClass(row));
   if (!message) return false;
   message->initWithData(event.payload);
   return message->isReadWhole();
@@ -112,7 +112,7 @@ int replay(const Options& options) {
     complain(prepared.error());
     return kFailure;
   }
-  if (options.rebaseTime) shiftToNow(*events, SystemClock().now());
+  if (options.rebaseTime) simulator::shiftToNow(*events, SystemClock().now());
 
   Summary summary;
   for (const RecordedEvent& event : *events) countEvent(event, summary);

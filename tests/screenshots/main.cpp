@@ -12,10 +12,10 @@
 
 #include <fmt/format.h>
 
-#include "TimeShift.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/SondrelSimulator.h"
 #include "hosts/simulator/TelephonyScript.h"
+#include "hosts/simulator/TimeShift.h"
 #include "shell/view/Appearance.h"
 #include "support/TimeZone.h"
 #include "support/VirtualTimeVfs.h"
@@ -143,7 +143,7 @@ class Photographer : public WindowPhone {
       for (const simulator::RecordedEvent& event : events_) {
         phone.time.setNow(begin + std::chrono::milliseconds(event.atMs.value_or(0)));
         std::vector<simulator::RecordedEvent> heard = {event};
-        tool::shiftToNow(heard, phone.time.now());
+        simulator::shiftToNow(heard, phone.time.now());
         phone.zelkor.deliver(zelkor::kEventMetric, heard.front().message());
       }
       phone.time.settle();

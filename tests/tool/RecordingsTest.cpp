@@ -5,8 +5,8 @@
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
-#include "CatalogueClass.h"
 #include "ToolRun.h"
+#include "hosts/simulator/CatalogueClass.h"
 #include "hosts/simulator/Recording.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MetricCodable.h"
@@ -35,7 +35,7 @@ std::vector<RecordedEvent> shippedRecording(const Family& family) {
 }
 
 std::optional<std::int64_t> subscriptionOf(const RecordedEvent& event, const MetricGroupV2& row) {
-  const auto message = makeMessage(decodingClass(row));
+  const auto message = makeMessage(simulator::decodingClass(row));
   message->initWithData(event.payload);
   const auto dictionary = message->dictionaryRepresentation();
   EXPECT_TRUE(dictionary) << row.className;
@@ -52,7 +52,7 @@ TEST(ShippedRecordings, HoldEveryDecodableMetricOfTheirFamilySeveralTimesForBoth
     const auto events = shippedRecording(family);
     std::size_t known = 0;
     for (const MetricGroupV2& row : MetricGroupV2::metricGroupData()) {
-      if (row.deviceType != family.name || makeMessage(decodingClass(row)) == nullptr) continue;
+      if (row.deviceType != family.name || makeMessage(simulator::decodingClass(row)) == nullptr) continue;
       std::map<std::optional<std::int64_t>, int> bySubscription;
       int count = 0;
       for (const RecordedEvent& event : events) {

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <utility>
 
-#include "TimeShift.h"
+#include "hosts/simulator/TimeShift.h"
 #include "platform/ZelkorClient.h"
 
 namespace quorl::desktop {
@@ -51,7 +51,7 @@ void PlayedRadio::playNext(const std::shared_ptr<State>& state) {
                                       const auto self = weak.lock();
                                       if (!self) return;
                                       std::vector<simulator::RecordedEvent> event = {self->events[self->next++]};
-                                      tool::shiftToNow(event, self->phone.clock.now());
+                                      simulator::shiftToNow(event, self->phone.clock.now());
                                       // Without a client it is gone, as on the device.
                                       self->phone.baseband.deliver(zelkor::kEventMetric, event.front().message());
                                       playNext(self);

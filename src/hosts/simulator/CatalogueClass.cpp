@@ -1,6 +1,6 @@
-#include "CatalogueClass.h"
+#include "hosts/simulator/CatalogueClass.h"
 
-namespace quorl::tool {
+namespace quorl::simulator {
 
 std::string_view decodingClass(const MetricGroupV2& row) {
   if (row.zelkorId == 806743) return "CellularLteConnectionStats";
@@ -8,4 +8,4 @@ std::string_view decodingClass(const MetricGroupV2& row) {
   return row.className;
 }
 
-}  // namespace quorl::tool
+}  // namespace quorl::simulator

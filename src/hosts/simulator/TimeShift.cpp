@@ -1,4 +1,4 @@
-#include "TimeShift.h"
+#include "hosts/simulator/TimeShift.h"
 
 #include <algorithm>
 #include <chrono>
@@ -7,21 +7,21 @@
 #include <string>
 #include <string_view>
 
-#include "CatalogueClass.h"
+#include "hosts/simulator/CatalogueClass.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MessageTable.h"
 #include "messages/MetricCodable.h"
 #include "messages/wire/WireReader.h"
 #include "messages/wire/WireWriter.h"
 
-namespace quorl::tool {
+namespace quorl::simulator {
 namespace {
 
 constexpr std::uint32_t kVarint = 0;
 constexpr std::uint32_t kEndOfGroup = 4;
 
 /// Tag of the timestamp in the class that decodes a metric; the classes of one id agree on it.
-std::optional<std::uint32_t> timestampTag(const simulator::RecordedEvent& event) {
+std::optional<std::uint32_t> timestampTag(const RecordedEvent& event) {
   for (const MetricGroupV2& row : MetricGroupV2::metricGroupData()) {
     if (event.metricID != row.zelkorId) continue;
     const auto message = makeMessage(decodingClass(row));
@@ -54,7 +54,7 @@ bool forEachTimestamp(std::string_view payload, std::uint32_t tag, const Visit& 
 }
 
 /// Milliseconds since 1970; nothing for a payload without one. Of several the last counts, as it does for a reader.
-std::optional<std::uint64_t> timestampOf(const simulator::RecordedEvent& event) {
+std::optional<std::uint64_t> timestampOf(const RecordedEvent& event) {
   if (!event.payload) return std::nullopt;
   const auto tag = timestampTag(event);
   std::optional<std::uint64_t> found;
@@ -79,14 +79,14 @@ ByteString withTimestamp(std::string_view payload, std::uint32_t tag, std::uint6
 
 }  // namespace
 
-void shiftToNow(std::vector<simulator::RecordedEvent>& events, Date now) {
+void shiftToNow(std::vector<RecordedEvent>& events, Date now) {
   std::optional<std::uint64_t> latest;
-  for (const simulator::RecordedEvent& event : events)
+  for (const RecordedEvent& event : events)
     if (const auto timestamp = timestampOf(event)) latest = std::max(latest.value_or(0), *timestamp);
   if (!latest) return;
   const auto nowMs =
       static_cast<std::uint64_t>(std::chrono::duration_cast<std::chrono::milliseconds>(now.time_since_epoch()).count());
-  for (simulator::RecordedEvent& event : events) {
+  for (RecordedEvent& event : events) {
     const auto timestamp = timestampOf(event);
     if (!timestamp) continue;
     const std::uint64_t age = *latest - *timestamp;
@@ -94,4 +94,4 @@ void shiftToNow(std::vector<simulator::RecordedEvent>& events, Date now) {
   }
 }
 
-}  // namespace quorl::tool
+}  // namespace quorl::simulator
