@@ -15,10 +15,9 @@
 #include "Documents.h"
 #include "JsonLine.h"
 #include "Player.h"
+#include "ProductRun.h"
 #include "TextTable.h"
 #include "ToolLog.h"
-#include "app/AppDelegate.h"
-#include "app/ApplicationLoop.h"
 #include "app/HardwareManager.h"
 #include "base/NotificationCenter.h"
 #include "base/Uuid.h"
@@ -134,25 +133,20 @@ int showCarriers(const Options& options) {
     return kFailure;
   }
 
-  // The product has no tear-down: what is made here lives until the process ends.
+  // As the product, they live until the process ends.
   const auto log = ToolLog::install(options.isVerbose);
   SimulatedPhone::Options description{options.device, documents.path(),
                                       simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)};
   description.isConsoleShown = options.isVerbose;
   static auto* phone = new SimulatedPhone(std::move(description));
   static const auto* bar = new CarrierBar;
-  static auto* application = new AppDelegate;
+  ProductRun product(*phone);
   Player player(*phone, *std::move(steps));
-  ApplicationLoop lifecycle(*application);
-  player.goTo(std::chrono::milliseconds(0));  // how the phone is found
-  lifecycle.launch();
-  phone->runUntilAtRest();
+  product.launch([&player] { player.goTo(std::chrono::milliseconds(0)); });
   player.goTo(options.untilMs ? std::chrono::milliseconds(*options.untilMs) : std::chrono::milliseconds::max());
   const bool isPressed = press(*bar, *phone, options.pressedTabs);
   if (isPressed) options.asJson ? printJson(*bar) : printTables(*bar);
-  lifecycle.terminate();
-  phone->runUntilAtRest();
-  installLogSink(nullptr);
+  product.terminate();
 
   const auto folded = documents.isNamed() ? foldWriteAheadLog(documents.path()) : tl::expected<void, std::string>();
   if (!folded) complain(folded.error());

@@ -17,10 +17,9 @@
 #include "Documents.h"
 #include "JsonLine.h"
 #include "Player.h"
+#include "ProductRun.h"
 #include "RowCounter.h"
 #include "ToolLog.h"
-#include "app/AppDelegate.h"
-#include "app/ApplicationLoop.h"
 #include "hosts/simulator/CatalogueClass.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/SimulatedPhone.h"
@@ -117,25 +116,20 @@ int replay(const Options& options) {
   Summary summary;
   for (const RecordedEvent& event : *events) countEvent(event, summary);
 
-  // The product has no tear-down: what is made here lives until the process ends.
+  // As the product, they live until the process ends.
   const auto log = ToolLog::install(options.isVerbose);
   static auto* phone = new SimulatedPhone(
       {options.device, options.documents, simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)});
-  static auto* application = new AppDelegate;
+  ProductRun product(*phone);
   static const auto* rows = new RowCounter;
   const auto start = std::chrono::steady_clock::now();
   Player player(*phone, *std::move(steps));
-  ApplicationLoop lifecycle(*application);
-  player.goTo(std::chrono::milliseconds(0));  // how the phone is found
-  lifecycle.launch();
-  phone->runUntilAtRest();
+  product.launch([&player] { player.goTo(std::chrono::milliseconds(0)); });
   const bool isTaken = player.play(*events);
-  lifecycle.terminate();
-  phone->runUntilAtRest();
+  product.terminate();
   summary.seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
   summary.rowsInserted = rows->count();
   summary.insertsFailed = log->failedInserts();
-  installLogSink(nullptr);
 
   print(summary);
   if (!isTaken) complain("the baseband manager had no configuration; is the resource deviceconfig missing?");

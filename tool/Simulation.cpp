@@ -7,10 +7,9 @@
 #include <utility>
 
 #include "Documents.h"
+#include "ProductRun.h"
 #include "RowCounter.h"
 #include "ToolLog.h"
-#include "app/AppDelegate.h"
-#include "app/ApplicationLoop.h"
 #include "hosts/simulator/RecordingWriter.h"
 #include "hosts/simulator/SimulatedPhone.h"
 
@@ -90,13 +89,9 @@ tl::expected<LivedScenario, std::string> SimulatedProduct::live(LiveScenario::Op
   if (!scenario) return tl::unexpected(std::move(scenario.error()));
   const auto log = ToolLog::install(/*isVerbose=*/false);
   const auto begin = std::chrono::steady_clock::now();
-  static auto* application = new AppDelegate;
+  ProductRun product(phone);
   static const auto* rows = new RowCounter;
-  ApplicationLoop lifecycle(*application);
-  (*scenario)->advance(milliseconds(1));  // how the phone is found
-  phone.runUntilAtRest();
-  lifecycle.launch();
-  phone.runUntilAtRest();
+  product.launch([&scenario] { (*scenario)->advance(milliseconds(1)); });
   milliseconds passed{0};
   inPortions(length, progress, [&](milliseconds portion) {
     if (isPaced) {
@@ -107,11 +102,10 @@ tl::expected<LivedScenario, std::string> SimulatedProduct::live(LiveScenario::Op
     phone.runUntilAtRest();
     passed += portion;
   });
-  lifecycle.terminate();
   std::optional<RecordingWriter::Outcome> recorded;
-  (*scenario)->finishRecording([&recorded](const RecordingWriter::Outcome& outcome) { recorded = outcome; });
-  phone.runUntilAtRest();
-  installLogSink(nullptr);
+  product.terminate([&] {
+    (*scenario)->finishRecording([&recorded](const RecordingWriter::Outcome& outcome) { recorded = outcome; });
+  });
   if (recording && recorded && !*recorded) return tl::unexpected(recording->string() + ": " + recorded->error());
   return LivedScenario{(*scenario)->events(), rows->count(), log->failedInserts(), secondsSince(begin)};
 }

@@ -4,14 +4,15 @@
 #include <string>
 #include <vector>
 
+#include <fmt/format.h>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
-#include <sqlite3.h>
 #include <sys/stat.h>
 
 #include "Hexadecimal.h"
 #include "ToolRun.h"
 #include "hosts/simulator/Recording.h"
+#include "store/RawDatabase.h"
 #include "support/TemporaryDirectory.h"
 
 namespace quorl::test {
@@ -22,21 +23,8 @@ using Rows = std::vector<std::string>;
 
 /// The rows of a query on a database file, columns joined by "|".
 Rows query(const fs::path& file, const char* sql) {
-  sqlite3* handle = nullptr;
-  EXPECT_EQ(sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr), SQLITE_OK);
-  const std::unique_ptr<sqlite3, int (*)(sqlite3*)> closing(handle, sqlite3_close);
-  sqlite3_stmt* statement = nullptr;
-  EXPECT_EQ(sqlite3_prepare_v2(handle, sql, -1, &statement, nullptr), SQLITE_OK) << sqlite3_errmsg(handle);
-  const std::unique_ptr<sqlite3_stmt, int (*)(sqlite3_stmt*)> finalizing(statement, sqlite3_finalize);
   Rows rows;
-  while (sqlite3_step(statement) == SQLITE_ROW) {
-    std::string row;
-    for (int column = 0; column < sqlite3_column_count(statement); ++column) {
-      const unsigned char* text = sqlite3_column_text(statement, column);
-      row += (column > 0 ? "|" : "") + std::string(text == nullptr ? "" : reinterpret_cast<const char*>(text));
-    }
-    rows.push_back(row);
-  }
+  for (const Row& row : RawDatabase(file).run(sql)) rows.push_back(fmt::format("{}", fmt::join(row, "|")));
   return rows;
 }
 

@@ -6,11 +6,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
-#include <sqlite3.h>
 #include <sys/stat.h>
 
 #include "TextTable.h"
 #include "ToolRun.h"
+#include "store/RawDatabase.h"
 #include "support/TemporaryDirectory.h"
 
 // The subcommands that show what the screens show.
@@ -51,13 +51,7 @@ class ScreensTool : public testing::Test {
     return lines;
   }
 
-  void sql(const std::string& text) const {
-    sqlite3* handle = nullptr;
-    ASSERT_EQ(sqlite3_open_v2((documents() + "/metricPartV11.sqlite").c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr),
-              SQLITE_OK);
-    const std::unique_ptr<sqlite3, int (*)(sqlite3*)> closing(handle, sqlite3_close);
-    ASSERT_EQ(sqlite3_exec(handle, text.c_str(), nullptr, nullptr, nullptr), SQLITE_OK) << sqlite3_errmsg(handle);
-  }
+  void sql(const std::string& text) const { RawDatabase(documents() + "/metricPartV11.sqlite").run(text); }
   /// A row of today, also if midnight passes during the test.
   void stored(const std::string& tech, const std::string& metric, const std::string& attribute,
               const std::string& value, int subsId = 0, const std::string& when = "+1 minutes",

@@ -61,4 +61,23 @@ void setNetwork(Message& message, const RadioWorld& world) {
   if constexpr (requires { message.setNumMncDigits(0U); }) message.setNumMncDigits(world.mncDigits());
 }
 
+/// Sets what both families say of the serving LTE cell. `bandwidth` is in the unit of the message.
+template <typename Message>
+void setLteServingCell(Message& message, RadioWorld& world, std::uint32_t bandwidth) {
+  setNetwork(message, world);
+  const LteCell& cell = world.lte();
+  message.setPhyCellId(cell.pci);
+  message.setDlFreq(cell.dlEarfcn);
+  message.setUlFreq(cell.ulEarfcn);
+  message.setDlBw(bandwidth);
+  message.setUlBw(bandwidth);
+  message.setCellId(cell.cellId);
+  message.setFreqBandInd(cell.band);
+  message.setTrackingAreaCode(cell.tac);
+  message.setTddSfAssignment(0);
+  message.setTddSsfPatterns(0);
+  message.setHstCellInfo(0);
+  message.setPrioOfCampedLteBand(world.count(4, 7));
+}
+
 }  // namespace quorl::tool

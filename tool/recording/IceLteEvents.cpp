@@ -24,20 +24,7 @@ ByteString rrcState(RadioWorld& world) {
 ByteString servingCell(RadioWorld& world) {
   KCellularLteScellInfo message;
   setCommon(message, world);
-  setNetwork(message, world);
-  const LteCell& cell = world.lte();
-  message.setPhyCellId(cell.pci);
-  message.setDlFreq(cell.dlEarfcn);
-  message.setUlFreq(cell.ulEarfcn);
-  message.setDlBw(cell.resourceBlocks * 2);
-  message.setUlBw(cell.resourceBlocks * 2);
-  message.setCellId(cell.cellId);
-  message.setFreqBandInd(cell.band);
-  message.setTrackingAreaCode(cell.tac);
-  message.setTddSfAssignment(0);
-  message.setTddSsfPatterns(0);
-  message.setPrioOfCampedLteBand(world.count(4, 7));
-  message.setHstCellInfo(0);
+  setLteServingCell(message, world, world.lte().resourceBlocks * 2);
   return payload(message);
 }
 

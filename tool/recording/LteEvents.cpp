@@ -14,22 +14,9 @@ namespace {
 ByteString servingCell(RadioWorld& world) {
   CellularLteScellInfo message;
   setCommon(message, world);
-  setNetwork(message, world);
-  const LteCell& cell = world.lte();
-  message.setPhyCellId(cell.pci);
-  message.setDlFreq(cell.dlEarfcn);
-  message.setUlFreq(cell.ulEarfcn);
-  message.setDlBw(cell.resourceBlocks);
-  message.setUlBw(cell.resourceBlocks);
-  message.setCellId(cell.cellId);
-  message.setFreqBandInd(cell.band);
-  message.setTrackingAreaCode(cell.tac);
+  setLteServingCell(message, world, world.lte().resourceBlocks);
   message.setAllowedAccess(1);
-  message.setTddSfAssignment(0);
-  message.setTddSsfPatterns(0);
   message.setCellIsApo(false);
-  message.setHstCellInfo(0);
-  message.setPrioOfCampedLteBand(world.count(4, 7));
   return payload(message);
 }
 

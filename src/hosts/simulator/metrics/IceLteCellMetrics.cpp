@@ -28,19 +28,7 @@ Payload servingCell(const Moment& moment) {
   const Cell& cell = *serving->best.cell;
   KCellularLteScellInfo message;
   setCommon(message, moment);
-  setNetwork(message, cell.plmn);
-  message.setPhyCellId(cell.physicalId);
-  message.setDlFreq(cell.downlinkChannel);
-  message.setUlFreq(cell.uplinkChannel);
-  message.setDlBw(resourceBlocks(cell) * 2);
-  message.setUlBw(resourceBlocks(cell) * 2);
-  message.setCellId(u32(cell.cellId));
-  message.setFreqBandInd(cell.band);
-  message.setTrackingAreaCode(cell.areaCode);
-  message.setTddSfAssignment(cell.isTdd ? 2 : 0);
-  message.setTddSsfPatterns(cell.isTdd ? 7 : 0);
-  message.setPrioOfCampedLteBand(cell.priority);
-  message.setHstCellInfo(0);
+  setLteServingCell(message, cell, resourceBlocks(cell) * 2);
   return payload(message);
 }
 

@@ -105,23 +105,34 @@ std::int32_t failureCause(const RegistrationContext& registration) {
   return registration.rejectCause != 0 ? KNAS_MM_PROC_FAILURE_CAUSE_REJECTED_BY_NW : KNAS_MM_PROC_FAILURE_CAUSE_NONE;
 }
 
+/// Sets what the circuit-switched and the packet context say alike.
+template <typename Message>
+void setOlderContext(Message& message, const Moment& moment) {
+  setCommon(message, moment);
+  message.setRegStatus(statusNumber(moment.state));
+  message.setProcFailureCause(failureCause(moment.state.registration));
+  message.setRejectCause(moment.state.registration.rejectCause);
+}
+
+template <typename Area>
+auto olderArea(const RegistrationContext& registration) {
+  auto area = makeMessageRef<Area>();
+  area->setEncodedPlmn(plmnBytes(registration.plmn));
+  area->setLac(registration.areaCode);
+  return area;
+}
+
 Payload circuitContext(const Moment& moment) {
   using Context = KCellularMmContext;
   const SubscriptionState& state = moment.state;
   if (!hasOlderContexts(state)) return std::nullopt;
   const RegistrationContext& registration = state.registration;
   Context message;
-  setCommon(message, moment);
-  message.setRegStatus(statusNumber(state));
+  setOlderContext(message, moment);
   message.setUpdateStatus(isRegistered(state) ? Context::STATUS_UPDATED : Context::STATUS_NOT_UPDATED);
-  auto area = makeMessageRef<KCellularLocationAreaId>();
-  area->setEncodedPlmn(plmnBytes(registration.plmn));
-  area->setLac(registration.areaCode);
-  message.setLai(area);
+  message.setLai(olderArea<KCellularLocationAreaId>(registration));
   message.setTmsi(registration.circuitTemporaryId);
   message.setT3212DurS(registration.periodicTimerSeconds);
-  message.setProcFailureCause(failureCause(registration));
-  message.setRejectCause(registration.rejectCause);
   message.setIsCombinedProc(isCombined(registration.procedure));
   return payload(message);
 }
@@ -152,18 +163,13 @@ Payload packetContext(const Moment& moment) {
   if (!hasOlderContexts(state)) return std::nullopt;
   const RegistrationContext& registration = state.registration;
   Context message;
-  setCommon(message, moment);
-  message.setRegStatus(statusNumber(state));
+  setOlderContext(message, moment);
   message.setUpdateStatus(isRegistered(state) ? Context::GPRS_STATUS_UPDATED : Context::GPRS_STATUS_NOT_UPDATED);
-  auto area = makeMessageRef<RoutingAreaId>();
-  area->setEncodedPlmn(plmnBytes(registration.plmn));
-  area->setLac(registration.areaCode);
+  auto area = olderArea<RoutingAreaId>(registration);
   area->setRac(state.serving ? state.serving->best.cell->routingArea : 0U);
   message.setRai(area);
   message.setPTmsi(registration.temporaryId);
   message.setT3312DurS(registration.periodicTimerSeconds);
-  message.setProcFailureCause(failureCause(registration));
-  message.setRejectCause(registration.rejectCause);
   message.setRegProc(packetProcedure(registration.procedure));
   return payload(message);
 }

@@ -41,21 +41,9 @@ Payload servingCell(const Moment& moment) {
   const Cell& cell = *serving->best.cell;
   CellularLteScellInfo message;
   setCommon(message, moment);
-  setNetwork(message, cell.plmn);
-  message.setPhyCellId(cell.physicalId);
-  message.setDlFreq(cell.downlinkChannel);
-  message.setUlFreq(cell.uplinkChannel);
-  message.setDlBw(resourceBlocks(cell));
-  message.setUlBw(resourceBlocks(cell));
-  message.setCellId(u32(cell.cellId));
-  message.setFreqBandInd(cell.band);
-  message.setTrackingAreaCode(cell.areaCode);
+  setLteServingCell(message, cell, resourceBlocks(cell));
   message.setAllowedAccess(1);
-  message.setTddSfAssignment(cell.isTdd ? 2 : 0);
-  message.setTddSsfPatterns(cell.isTdd ? 7 : 0);
   message.setCellIsApo(false);
-  message.setHstCellInfo(0);
-  message.setPrioOfCampedLteBand(cell.priority);
   return payload(message);
 }
 

@@ -95,4 +95,28 @@ void setNetwork(Message& message, const network::Plmn& plmn) {
   if constexpr (requires { message.setNumMncDigits(0U); }) message.setNumMncDigits(plmn.mncDigits);
 }
 
+/// Sets what LTE and NR alike say of a serving cell. `bandwidth` is in the unit of the message.
+template <typename Message>
+void setServingCell(Message& message, const network::Cell& cell, std::uint32_t bandwidth) {
+  setNetwork(message, cell.plmn);
+  message.setPhyCellId(cell.physicalId);
+  message.setDlFreq(cell.downlinkChannel);
+  message.setUlFreq(cell.uplinkChannel);
+  message.setDlBw(bandwidth);
+  message.setUlBw(bandwidth);
+  message.setCellId(u32(cell.cellId));
+  message.setTrackingAreaCode(cell.areaCode);
+}
+
+/// The same of LTE, whose families differ in little but the unit.
+template <typename Message>
+void setLteServingCell(Message& message, const network::Cell& cell, std::uint32_t bandwidth) {
+  setServingCell(message, cell, bandwidth);
+  message.setFreqBandInd(cell.band);
+  message.setTddSfAssignment(cell.isTdd ? 2 : 0);
+  message.setTddSsfPatterns(cell.isTdd ? 7 : 0);
+  message.setHstCellInfo(0);
+  message.setPrioOfCampedLteBand(cell.priority);
+}
+
 }  // namespace quorl::simulator::metrics

@@ -117,15 +117,8 @@ Payload servingCell(const Moment& moment) {
   const Cell& cell = *serving->best.cell;
   CellularNrScellInfo message;
   setCommon(message, moment);
-  setNetwork(message, cell.plmn);
-  message.setPhyCellId(cell.physicalId);
-  message.setDlFreq(cell.downlinkChannel);
-  message.setUlFreq(cell.uplinkChannel);
-  message.setDlBw(resourceBlocks(cell));
-  message.setUlBw(resourceBlocks(cell));
-  message.setCellId(u32(cell.cellId));
+  setServingCell(message, cell, resourceBlocks(cell));
   message.setAllowedAccess(1);
-  message.setTrackingAreaCode(cell.areaCode);
   return payload(message);
 }
 
