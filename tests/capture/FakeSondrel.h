@@ -30,9 +30,9 @@ class FakeSondrelFactory final : public SondrelFactory {
   class Library final : public Sondrel {
    public:
     explicit Library(FakeSondrelFactory& factory) : factory_(factory) {}
-    void setDelegate(std::weak_ptr<SondrelDelegate> delegate) override {
+    void setDelegate(std::weak_ptr<SondrelDelegate> listener) override {
       factory_.record("setDelegate");
-      factory_.delegate = std::move(delegate);
+      factory_.delegate = std::move(listener);
     }
     void start(const SondrelConfiguration& configuration) override {
       factory_.record("start");

@@ -55,9 +55,9 @@ class FakeTelephony final : public HorvaneClientFactory {
    public:
     explicit Client(FakeTelephony& fake) : fake_(fake) {}
 
-    void setDelegate(std::weak_ptr<HorvaneClientDelegate> delegate) override {
+    void setDelegate(std::weak_ptr<HorvaneClientDelegate> listener) override {
       fake_.calls.emplace_back("setDelegate");
-      fake_.delegate = std::move(delegate);
+      fake_.delegate = std::move(listener);
     }
     void getSubscriptionInfo(
         std::function<void(std::optional<HVServiceSubscriptionInfo>, std::optional<HVError>)> completion) override {
