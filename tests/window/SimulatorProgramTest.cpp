@@ -24,7 +24,6 @@ class SimulatorProgram : public ::testing::Test {
  protected:
   struct Ended {
     int code = -1;
-    std::string output;
     std::string errors;
   };
 
@@ -41,11 +40,17 @@ class SimulatorProgram : public ::testing::Test {
     process.start(QUORL_SIMULATOR, arguments);
     ASSERT_TRUE(process.waitForStarted());
   }
+  bool waitsForOutput(const std::string& text) {
+    while (output.find(text) == std::string::npos) {
+      if (!process.waitForReadyRead(kLongestRunMs)) return false;
+      output += process.readAllStandardOutput().toStdString();
+    }
+    return true;
+  }
   Ended end() {
-    constexpr int kLongestRunMs = 60000;
     EXPECT_TRUE(process.waitForFinished(kLongestRunMs));
     return {process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1,
-            process.readAllStandardOutput().toStdString(), process.readAllStandardError().toStdString()};
+            process.readAllStandardError().toStdString()};
   }
   Ended run(const std::vector<std::string>& options) {
     start(options);
@@ -53,6 +58,9 @@ class SimulatorProgram : public ::testing::Test {
   }
   std::string single(const std::string& sql) { return RawDatabase(database).column(sql).at(0); }
 
+  static constexpr int kLongestRunMs = 60000;
+
+  std::string output;  // so far
   TemporaryDirectory directory;
   const std::filesystem::path documents = directory.path() / "documents";
   const std::filesystem::path database = documents / "metricPartV11.sqlite";
@@ -60,11 +68,12 @@ class SimulatorProgram : public ::testing::Test {
 };
 
 TEST_F(SimulatorProgram, OpensOnACityWithAHistory) {
-  const Ended ended = run({"--print", "--seconds", "2.5", "--history-days", "2"});
+  start({"--print", "--history-days", "2"});
+  const bool showsBoth = waitsForOutput("Serving Cell Info") && waitsForOutput("Priority of the camped LTE band");
+  process.terminate();
+  const Ended ended = end();
+  EXPECT_TRUE(showsBoth) << "a system without a language reads English: " << output;
   EXPECT_EQ(ended.code, 0) << ended.errors;
-  EXPECT_THAT(ended.output, HasSubstr("Serving Cell Info"));
-  EXPECT_THAT(ended.output, HasSubstr("Priority of the camped LTE band"))
-      << "a system without a language reads English";
   EXPECT_THAT(ended.errors, testing::AllOf(StartsWith("quorl-simulator: a history of "), HasSubstr(" over 2 days")));
   EXPECT_EQ(std::count(ended.errors.begin(), ended.errors.end(), '\n'), 1) << "no warning: " << ended.errors;
   EXPECT_GT(std::stoi(single("SELECT count(DISTINCT date(collected_on)) FROM Metric")), 1);

@@ -14,8 +14,12 @@ constexpr double kUsualDotsPerInch = 96;
 
 }  // namespace
 
-SystemAppearance::SystemAppearance() {
+SystemAppearance::SystemAppearance(DesktopPortal* portal) : portal_(portal) {
   qGuiApp->installEventFilter(this);
+  if (portal_ != nullptr) {
+    portal_->setParent(this);
+    connect(portal_, &DesktopPortal::changed, this, [this] { take(); });
+  }
   take();
 }
 
@@ -24,10 +28,13 @@ bool SystemAppearance::eventFilter(QObject* watched, QEvent* event) {
   return QObject::eventFilter(watched, event);
 }
 
-void SystemAppearance::take() {
+void SystemAppearance::take() const {
   view::Appearance& appearance = view::Appearance::shared();
   const QPalette palette = QGuiApplication::palette();
-  appearance.setDark(palette.color(QPalette::Window).lightness() < palette.color(QPalette::WindowText).lightness());
+  const bool isDarkPalette =
+      palette.color(QPalette::Window).lightness() < palette.color(QPalette::WindowText).lightness();
+  appearance.setDark(portal_ != nullptr ? portal_->isDark().value_or(isDarkPalette) : isDarkPalette);
+  appearance.setReducedMotion(portal_ != nullptr && portal_->hasReducedMotion().value_or(false));
   if (const QScreen* screen = QGuiApplication::primaryScreen())
     appearance.setFontScale(screen->logicalDotsPerInch() / kUsualDotsPerInch);
 }

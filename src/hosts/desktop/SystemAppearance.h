@@ -2,19 +2,27 @@
 
 #include <QObject>
 
+#include "hosts/desktop/DesktopPortal.h"
+
 namespace quorl::desktop {
 
-/// Keeps `view::Appearance` as the desktop wants it: light or dark and the scale of type. Main thread.
+/// Keeps `view::Appearance` as the desktop wants it: light or dark, the scale of type, and how much may move. Main
+/// thread.
 class SystemAppearance final : public QObject {
  public:
-  /// Follows the application from now on.
-  SystemAppearance();
+  /// Follows the application and the session's portal from now on.
+  SystemAppearance() : SystemAppearance(DesktopPortal::ofSession(nullptr)) {}
+  /// Follows the application and `portal`, which may be null and belongs to it from now on. What the portal does not
+  /// know is as the application's palette has it.
+  explicit SystemAppearance(DesktopPortal* portal);
 
  protected:
   bool eventFilter(QObject* watched, QEvent* event) override;
 
  private:
-  static void take();
+  void take() const;
+
+  DesktopPortal* const portal_;
 };
 
 }  // namespace quorl::desktop
