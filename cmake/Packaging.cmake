@@ -30,6 +30,18 @@ foreach(program IN LISTS programs)
 endforeach()
 add_custom_target(quorl_manuals ALL DEPENDS ${packed_manuals})
 install(FILES ${packed_manuals} DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
+
+# What a Debian package has to say of itself.
+set(CPACK_PACKAGE_CONTACT "The Quorl developers <quorl@localhost>")
+set(QUORL_CHANGELOG_DATE "Sat, 21 Nov 2026 12:00:00 +0000")
+configure_file(${PROJECT_SOURCE_DIR}/packaging/changelog.in ${CMAKE_BINARY_DIR}/packaging/changelog @ONLY)
+set(packed_changelog ${CMAKE_BINARY_DIR}/packaging/changelog.gz)
+add_custom_command(
+  OUTPUT ${packed_changelog}
+  COMMAND gzip -9nc ${CMAKE_BINARY_DIR}/packaging/changelog > ${packed_changelog}
+  DEPENDS ${CMAKE_BINARY_DIR}/packaging/changelog VERBATIM)
+add_custom_target(quorl_changelog ALL DEPENDS ${packed_changelog})
+install(FILES ${packed_changelog} ${PROJECT_SOURCE_DIR}/packaging/copyright DESTINATION ${CMAKE_INSTALL_DOCDIR})
 install(FILES ${PROJECT_SOURCE_DIR}/README.md ${PROJECT_SOURCE_DIR}/CHANGELOG.md ${PROJECT_SOURCE_DIR}/SECURITY.md
         DESTINATION ${CMAKE_INSTALL_DOCDIR})
 
@@ -45,6 +57,12 @@ if(TARGET quorl-simulator)
           DESTINATION ${CMAKE_INSTALL_DATADIR}/icons/hicolor/scalable/apps)
 endif()
 
+if(QUORL_TESTS AND NOT QUORL_SANITIZE AND NOT QUORL_FUZZ)
+  list(TRANSFORM programs REPLACE "(.+)" "$<TARGET_FILE:\\1>" OUTPUT_VARIABLE program_files)
+  add_test(NAME hardening COMMAND ${PROJECT_SOURCE_DIR}/scripts/check_hardening.sh
+                                  $<IF:$<BOOL:${QUORL_HARDENED}>,--compiled,--linked> ${program_files})
+endif()
+
 if(QUORL_TESTS AND TARGET quorl-simulator)
   find_program(DESKTOP_FILE_VALIDATE desktop-file-validate REQUIRED)
   find_program(APPSTREAMCLI appstreamcli REQUIRED)
@@ -57,12 +75,11 @@ endif()
 set(CPACK_GENERATOR DEB)
 set(CPACK_PACKAGE_NAME quorl)
 set(CPACK_PACKAGE_VENDOR "The Quorl developers")
-set(CPACK_PACKAGE_CONTACT "The Quorl developers <quorl@localhost>")
 set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "cellular diagnostics monitor")
 set(CPACK_DEBIAN_PACKAGE_DESCRIPTION
     "Shows what the baseband of a phone is doing now and what it did over the last\n\
- thirty days: a dashboard of pinned attributes, metrics by technology, details,\n\
- history, export and log capture. This package runs it on a simulated phone.")
+thirty days: a dashboard of pinned attributes, metrics by technology, details,\n\
+history, export and log capture. This package runs it on a simulated phone.")
 set(CPACK_STRIP_FILES ON)
 set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
