@@ -17,6 +17,15 @@ class AllMetricsWindowTest : public test::ScreenWindowTest {
     launch();
     showsAllMetrics();
   }
+  QImage pictureOfList() { return grab().copy(place(find("base")).toRect()); }
+  /// Without what earlier frames may have left: the window's colour lies under all, and draws all when it changes.
+  QImage drawnAnew() {
+    const QColor color = window().color();
+    window().setColor(color == Qt::red ? Qt::blue : Qt::red);
+    const QImage picture = pictureOfList();
+    window().setColor(color);
+    return picture;
+  }
   std::vector<std::string> names() { return column("metricRow", "name"); }
   std::ptrdiff_t queries() {
     return std::count(phone.zelkor.calls.begin(), phone.zelkor.calls.end(), "kCommandQueryMetric");
@@ -113,6 +122,29 @@ TEST_F(AllMetricsWindowTest, TheHeaderOfATechnologySticks) {
   EXPECT_TRUE(std::any_of(headers.begin(), headers.end(), [&](QQuickItem* header) {
     return header->property("text").toString() == "LTE" && place(header).top() == place(list).top();
   }));
+}
+
+TEST_F(AllMetricsWindowTest, NothingIsLeftBehindOnTheScreenByScrolling) {
+  for (const char* tech : {"5G", "LTE", "MISC"})
+    for (int i = 0; i < 14; ++i) hasStored(reading(tech, tech + (" metric " + std::to_string(i)), "a", "1"));
+  setSize(1024, 767);
+  launchOnList();
+  QQuickItem* const list = find("metricsList");
+  for (const double to : {264.5, 529.0, 793.5, 300.3, 1058.0, 20.7}) {
+    list->setProperty("contentY", list->property("originY").toDouble() + to);
+    settle();
+    pass(300ms);  // the large title goes
+    EXPECT_TRUE(pictureOfList() == drawnAnew()) << to;
+  }
+  for (const int distance : {-217, -133, -301, 251}) {
+    swipe(list, 0, distance);
+    for (int frames = 0; frames < 20; ++frames) {
+      WindowTest::pass(48ms);
+      EXPECT_TRUE(pictureOfList() == drawnAnew()) << distance << ", frame " << frames;
+    }
+  }
+  opens(names().at(3));
+  EXPECT_TRUE(pictureOfList() == drawnAnew());
 }
 
 TEST_F(AllMetricsWindowTest, TheFilterFindsNamesAndTechnologiesWhateverTheCase) {

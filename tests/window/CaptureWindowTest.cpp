@@ -301,7 +301,7 @@ TEST_F(CaptureWindowTest, AChosenConfigurationIsNamedAndCaptured) {
   EXPECT_NEAR(find("transitionCircle")->scale(), 0.5, 0.1) << "it shrinks back";
   pass(500ms);
   EXPECT_FALSE(isShown("choiceList"));
-  EXPECT_EQ(text("configTitle"), "Log Configuration: <font color=\"#c2410c\">Voice</font>");
+  EXPECT_EQ(text("configTitle"), "Log Configuration: <font color=\"#b63c0b\">Voice</font>");
   tap("startButton");
   pass(2500ms);
   EXPECT_EQ(firstRowText("titleLabel"), "File name: 000001-Voice.chunk");

@@ -1,3 +1,4 @@
+#include <QTest>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -47,6 +48,31 @@ class ExportWindowTest : public test::ScreenWindowTest {
     find("fileNameField")->forceActiveFocus();
     key(Qt::Key_A, Qt::ControlModifier);
     types(fileName);
+  }
+  /// Opens the dialog of folders, which reads them on a thread of its own.
+  void browses() {
+    tap("browseButton");
+    pass(500ms);
+  }
+  /// The toolkit's own dialog, as the offscreen platform has none.
+  QQuickItem* dialogButton(const QString& text) { return buttonBelow(window().contentItem(), text); }
+  void choosesInDialog(const QString& name) {
+    QQuickItem* folder = nullptr;
+    ASSERT_TRUE(QTest::qWaitFor([&] {
+      grab();
+      folder = dialogButton(name);
+      return folder != nullptr;
+    })) << ::testing::PrintToString(texts());
+    tap(folder);
+    pass(300ms);
+  }
+  QQuickItem* buttonBelow(QQuickItem* root, const QString& text) {
+    if (!root->isVisible() || root->objectName() == "saveSheetContent") return nullptr;
+    const bool isNamed = root->property("text") == text || root->property("fileName") == text;
+    if (isNamed && root->inherits("QQuickAbstractButton")) return root;
+    for (QQuickItem* child : root->childItems())
+      if (QQuickItem* button = buttonBelow(child, text)) return button;
+    return nullptr;
   }
   std::vector<std::string> files() const {
     std::vector<std::string> found;
@@ -138,6 +164,127 @@ TEST_F(ExportWindowTest, AFolderThatCannotBeWrittenIsToldAndAnotherCanBeChosen) 
   saves();
   EXPECT_THAT(text("saveMessage"), HasSubstr("Saved "));
   EXPECT_EQ(files().size(), 1U);
+}
+
+TEST_F(ExportWindowTest, AFolderWithoutItsWholePathIsRefused) {
+  launchOnExport();
+  chooses(0);
+  for (const char* folder : {"", "saved", "./saved", "~"}) {
+    SCOPED_TRACE(folder);
+    view::SaveText::shared().setFolder(folder);
+    saves();
+    EXPECT_THAT(text("saveMessage"), HasSubstr("A folder is given by its whole path"));
+  }
+  EXPECT_TRUE(files().empty());
+}
+
+TEST_F(ExportWindowTest, AnErrorTellsItsReasonAndLeavesTheDialogOpen) {
+  std::filesystem::create_directory(folder() / "a folder");
+  std::ofstream(folder() / "a file") << "mine";
+  launchOnExport();
+  chooses(0);
+  const QString fileName = view::SaveText::shared().fileName();
+  const struct {
+    std::string folder;
+    QString name;
+    const char* reason;
+  } refused[] = {
+      {folder().string() + "/missing", fileName, "No such file or directory"},
+      {folder().string() + "/a file", fileName, "Not a directory"},
+      {folder().string(), "a folder", "Is a directory"},
+      {folder().string(), QString(300, 'n'), "File name too long"},
+      {"/proc", fileName, "could not be written"},
+  };
+  for (const auto& [path, name, reason] : refused) {
+    SCOPED_TRACE(reason);
+    view::SaveText::shared().setFolder(QString::fromStdString(path));
+    view::SaveText::shared().setFileName(name);
+    saves();
+    EXPECT_THAT(text("saveMessage"), HasSubstr(reason));
+    EXPECT_THAT(text("saveMessage"), HasSubstr("The readings are kept"));
+    EXPECT_TRUE(isShown("saveButton"));
+    EXPECT_EQ(text("fileNameField"), name.toStdString());
+  }
+  EXPECT_EQ(files().size(), 2U);
+  view::SaveText::shared().setFolder(QString::fromStdString(folder().string()));
+  view::SaveText::shared().setFileName("at last.txt");
+  saves();
+  EXPECT_THAT(text("saveMessage"), HasSubstr("Saved "));
+}
+
+TEST_F(ExportWindowTest, AnErrorWhileReplacingKeepsWhatIsThere) {
+  std::ofstream(folder() / "mine.txt") << "mine";
+  launchOnExport();
+  chooses(0);
+  view::SaveText::shared().setFileName("mine.txt");
+  saves();
+  ASSERT_TRUE(isShown("replaceButton"));
+  std::filesystem::remove(folder() / "mine.txt");
+  std::filesystem::create_directory(folder() / "mine.txt");
+  tap("replaceButton");
+  pass(300ms);
+  EXPECT_THAT(text("saveMessage"), HasSubstr("mine.txt could not be written: Is a directory."));
+  EXPECT_TRUE(isShown("saveButton"));
+  EXPECT_TRUE(std::filesystem::is_directory(folder() / "mine.txt"));
+}
+
+TEST_F(ExportWindowTest, TheQuestionIsAnsweredByKeyboard) {
+  std::ofstream(folder() / "mine.txt") << "mine";
+  launchOnExport();
+  chooses(0);
+  names("mine.txt");
+  key(Qt::Key_Return);
+  pass(300ms);
+  ASSERT_TRUE(isShown("replaceButton"));
+  key(Qt::Key_Escape);  // keeps it, and asks again
+  pass(300ms);
+  EXPECT_TRUE(isShown("saveButton"));
+  EXPECT_TRUE(isShown("exportHeading"));
+  EXPECT_TRUE(find("fileNameField")->hasActiveFocus());
+  key(Qt::Key_Return);
+  pass(300ms);
+  EXPECT_TRUE(find("cancelSaveButton")->hasActiveFocus()) << "what does no harm is at hand";
+  EXPECT_EQ(contents("mine.txt"), "mine");
+  key(Qt::Key_Tab);
+  key(Qt::Key_Return);
+  pass(300ms);
+  EXPECT_THAT(text("saveMessage"), HasSubstr("Saved "));
+  EXPECT_TRUE(find("cancelSaveButton")->hasActiveFocus());
+  key(Qt::Key_Return);
+  pass(300ms);
+  EXPECT_FALSE(isShown("saveMessage"));
+  EXPECT_TRUE(isShown("exportHeading"));
+}
+
+TEST_F(ExportWindowTest, BrowseTakesTheFolderThatIsChosen) {
+  std::filesystem::create_directory(folder() / "inside");
+  launchOnExport();
+  chooses(0);
+  browses();
+  choosesInDialog("inside");
+  ASSERT_NE(dialogButton("Open"), nullptr);
+  tap(dialogButton("Open"));
+  pass(300ms);
+  EXPECT_EQ(dialogButton("Open"), nullptr);
+  EXPECT_EQ(text("folderField"), (folder() / "inside").string());
+  saves();
+  EXPECT_THAT(text("saveMessage"), HasSubstr((folder() / "inside").string()));
+  EXPECT_FALSE(std::filesystem::is_empty(folder() / "inside"));
+}
+
+TEST_F(ExportWindowTest, ABrowseThatIsCancelledLeavesTheFolderAndMayBeginAgain) {
+  std::filesystem::create_directory(folder() / "inside");
+  launchOnExport();
+  chooses(0);
+  for (int turn = 0; turn < 2; ++turn) {
+    browses();
+    choosesInDialog("inside");
+    ASSERT_NE(dialogButton("Cancel"), nullptr);
+    tap(dialogButton("Cancel"));
+    pass(300ms);
+    EXPECT_EQ(dialogButton("Open"), nullptr);
+    EXPECT_EQ(text("folderField"), folder().string());
+  }
 }
 
 TEST_F(ExportWindowTest, ANameThatIsNoneIsRefused) {

@@ -1,3 +1,4 @@
+#include <QFont>
 #include <algorithm>
 
 #include "ScreenWindow.h"
@@ -29,6 +30,8 @@ class HistoryWindowTest : public test::ScreenWindowTest {
     pass(600ms);
   }
   void selects(int segment) { tap("segment" + QString::number(segment)); }
+  QQuickItem* bar() { return findAll("pageBar").back(); }  // over the uppermost screen
+  std::string header() { return find("largeTitle", bar())->property("text").toString().toStdString(); }
   double height(QQuickItem* bar) { return find("barBody", bar)->height(); }
 };
 
@@ -36,7 +39,7 @@ TEST_F(HistoryWindowTest, DrawsABarForEachReadingOfToday) {
   hasStored(cellId("100"));
   hasStored(cellId("50"));
   launchOnGraph();
-  EXPECT_EQ(text("historyHeader"), "kHVCellMonitorCellId");
+  EXPECT_EQ(header(), "kHVCellMonitorCellId");
   EXPECT_EQ(text("historyCaption"), "2 readings · mean 75");
   EXPECT_THAT(column("tick", "text"), ElementsAre("100", "50", "0"));  // from the top down
   const auto bars = findAll("bar");
@@ -44,6 +47,17 @@ TEST_F(HistoryWindowTest, DrawsABarForEachReadingOfToday) {
   EXPECT_EQ(find("barBody", bars[0])->width(), 30);
   EXPECT_NEAR(height(bars[0]), 2 * height(bars[1]), 1e-6);
   EXPECT_EQ(place(find("barBody", bars[0])).bottom(), place(find("barBody", bars[1])).bottom());
+}
+
+TEST_F(HistoryWindowTest, TheAttributeIsNamedOnce) {
+  hasStored(cellId("100"));
+  launchOnGraph();
+  QQuickItem* page = bar()->parentItem();
+  EXPECT_EQ(std::ranges::count(texts(page), "kHVCellMonitorCellId"), 1);
+  selects(1);
+  EXPECT_EQ(std::ranges::count(texts(page), "kHVCellMonitorCellId average"), 1);
+  EXPECT_EQ(std::ranges::count(texts(page), "kHVCellMonitorCellId"), 0);
+  EXPECT_EQ(find("largeTitle", bar())->property("font").value<QFont>().pixelSize(), 34);
 }
 
 TEST_F(HistoryWindowTest, ATapSelectsABarAndTellsItsValueAndTime) {
@@ -79,7 +93,7 @@ TEST_F(HistoryWindowTest, WeekAndMonthShowOneAverageADay) {
   selects(1);
   pass(500ms);
   EXPECT_FALSE(isShown("emptyTitle"));
-  EXPECT_EQ(text("historyHeader"), "kHVCellMonitorCellId average");
+  EXPECT_EQ(header(), "kHVCellMonitorCellId average");
   EXPECT_EQ(text("historyCaption"), "1 day · mean 75");
   selects(2);
   EXPECT_EQ(text("historyCaption"), "2 days · mean 47.5");
@@ -107,6 +121,33 @@ TEST_F(HistoryWindowTest, NoTwoTimeLabelsOverlapAndTheLatestReadingIsInSight) {
   ASSERT_GT(labels.size(), 1U);
   for (std::size_t i = 1; i < labels.size(); ++i) EXPECT_GT(labels[i].left(), labels[i - 1].right());
   EXPECT_THAT(column("bar", "value"), Contains("120"));
+}
+
+TEST_F(HistoryWindowTest, TheLatestReadingIsWhollyInSightAtFirstAndAfterAResize) {
+  for (int i = 0; i < 40; ++i) hasStored(cellId(std::to_string(1000 * (i + 1))));
+  launchOnGraph();
+  const auto latest = [this] {
+    for (QQuickItem* bar : findAll("bar"))
+      if (bar->property("value") == "40000") return place(find("barBody", bar));
+    return QRectF();
+  };
+  for (const int width : {390, 320, 700}) {
+    setSize(width, 844);
+    grab();
+    EXPECT_GT(latest().width(), 0) << width;
+    EXPECT_LE(latest().right(), place(find("bars")).right()) << width;
+  }
+}
+
+TEST_F(HistoryWindowTest, ASelectedBarStaysInSightWhenTheWindowNarrows) {
+  for (int i = 0; i < 40; ++i) hasStored(cellId(std::to_string(i + 1)));
+  setSize(700, 844);
+  launchOnGraph();
+  tap(findAll("bar").front());
+  ASSERT_TRUE(isShown("selectedBubble"));
+  setSize(390, 844);
+  grab();
+  EXPECT_TRUE(isShown("selectedBubble"));
 }
 
 TEST_F(HistoryWindowTest, NegativeReadingsStandOnTheBaselineInsideThePlot) {

@@ -46,7 +46,7 @@ TEST_F(ShellWindowTest, ALaunchShowsTheDashboardsLargeTitleOverTheTabs) {
   launch();
   EXPECT_EQ(text("largeTitle"), "Dashboard");
   EXPECT_EQ(numberOfTabs(), 2);
-  EXPECT_EQ(tint(0), "#c2410c");
+  EXPECT_EQ(tint(0), "#b63c0b");
   EXPECT_EQ(tint(1), "#7a8594");
   EXPECT_FALSE(isShown("exportButton"));
 }
@@ -65,7 +65,7 @@ TEST_F(ShellWindowTest, TheBarsHaveTheirHeightsWithAndWithoutCarriers) {
 TEST_F(ShellWindowTest, ATapMovesTheMarkerAndThenChangesTheScreen) {
   launch();
   tap("menuCell1");
-  EXPECT_EQ(tint(1), "#c2410c");
+  EXPECT_EQ(tint(1), "#b63c0b");
   pass(250ms);
   EXPECT_EQ(title(), "Dashboard");
   EXPECT_GT(place("menuMarker").left(), 97);

@@ -19,7 +19,7 @@ PlainButton {
     background: Rectangle {
         radius: button.radius
         color: button.hovered ? Theme.card : "transparent"
-        border.width: button.visualFocus ? 3 : 1
+        border.width: button.activeFocus && FocusRing.isShown ? 3 : 1
         border.color: Theme.subtitleNumbers
     }
     contentItem: Text {

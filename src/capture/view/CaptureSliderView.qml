@@ -65,7 +65,7 @@ Slider {
             anchors.fill: parent
             anchors.margins: -3
             radius: width / 2
-            visible: slider.visualFocus
+            visible: slider.activeFocus && FocusRing.isShown
             color: "transparent"
             border.width: 2
             border.color: Theme.title

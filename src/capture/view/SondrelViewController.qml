@@ -55,6 +55,7 @@ FocusScope {
             objectName: "fileRow"
             width: ListView.view.width
             showsSeparator: false
+            inset: root.inset
 
             Rectangle {
                 anchors.fill: parent

@@ -39,7 +39,7 @@ T.AbstractButton {
 
     background: Rectangle {
         color: row.pressed ? Theme.pressed : "transparent"
-        border.width: row.visualFocus ? 2 : 0
+        border.width: row.activeFocus && FocusRing.isShown ? 2 : 0
         border.color: Theme.buttonSelected
 
         Rectangle {
@@ -58,12 +58,31 @@ T.AbstractButton {
         readonly property bool showsTrace: row.trace.length > 1 && room > 260
         readonly property real valueRoom: room - (showsTrace ? traceLine.width + 2 * Theme.grid : 0)
 
+        FontMetrics {
+            id: nameMetrics
+
+            font.pixelSize: Theme.row
+        }
+        FontMetrics {
+            id: contextMetrics
+
+            font.pixelSize: Theme.caption
+        }
         Column {
             id: names
 
             anchors.left: parent.left
             anchors.verticalCenter: parent.verticalCenter
-            width: Math.max(0.42 * content.valueRoom, content.valueRoom - valueText.naturalWidth - 3 * Theme.grid)
+            // What the value leaves; beside a long value what the names need, up to two fifths.
+            width: {
+                const left = content.valueRoom - valueText.naturalWidth - 3 * Theme.grid
+                const most = 0.42 * content.valueRoom
+                return left >= most ? left : Math.max(left, Math.min(most, needed()))
+            }
+
+            function needed(): real {
+                return Math.ceil(Math.max(nameMetrics.advanceWidth(row.name), contextMetrics.advanceWidth(row.context)))
+            }
 
             Text {
                 width: parent.width

@@ -34,6 +34,7 @@ Item {
                 required property int index
                 required property string modelData
                 readonly property bool isCurrent: index === root.currentIndex
+                readonly property bool isMarked: activeFocus && FocusRing.isShown
 
                 objectName: "segment" + index
                 width: root.width / root.labels.length
@@ -64,8 +65,8 @@ Item {
                         anchors.bottomMargin: 1.5 * Theme.grid
                         radius: 1.5 * Theme.grid
                         color: segment.isCurrent ? Theme.background : segment.pressed ? Theme.pressed : "transparent"
-                        border.width: segment.visualFocus ? 2 : segment.isCurrent ? 1 : 0
-                        border.color: segment.visualFocus ? Theme.buttonSelected : Theme.line
+                        border.width: segment.isMarked ? 2 : segment.isCurrent ? 1 : 0
+                        border.color: segment.isMarked ? Theme.buttonSelected : Theme.line
                     }
                 }
             }

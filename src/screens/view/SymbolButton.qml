@@ -28,7 +28,7 @@ T.AbstractButton {
         anchors.margins: Theme.grid / 2
         radius: width / 2
         color: button.pressed || button.hovered ? Theme.pressed : "transparent"
-        border.width: button.visualFocus ? 2 : 0
+        border.width: button.activeFocus && FocusRing.isShown ? 2 : 0
         border.color: Theme.buttonSelected
     }
 

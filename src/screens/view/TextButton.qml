@@ -35,7 +35,7 @@ T.AbstractButton {
         radius: 2 * Theme.grid
         color: button.isFilled ? Theme.buttonSelected : button.pressed || button.hovered ? Theme.pressed : "transparent"
         opacity: button.isFilled && button.pressed ? 0.8 : 1
-        border.width: button.visualFocus ? 2 : 0
+        border.width: button.activeFocus && FocusRing.isShown ? 2 : 0
         border.color: button.isFilled ? Theme.title : Theme.buttonSelected
     }
 

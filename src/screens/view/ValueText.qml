@@ -53,8 +53,8 @@ Item {
         visible: !root.isNumber
         width: root.width
         anchors.verticalCenter: parent.verticalCenter
-        // A list breaks behind its commas.
-        text: root.isNumber ? "" : root.wraps ? root.text.replace(/,/g, ",\u200b") : root.text
+        // A list breaks behind its commas, an enumerator between its words.
+        text: root.isNumber ? "" : root.wraps ? root.text.replace(/[,_]/g, "$&\u200b") : root.text
         font: metrics.font
         color: root.color
         horizontalAlignment: Text.AlignRight

@@ -10,6 +10,7 @@ Item {
     property string valueText
     property bool showsActivityIndicator: false
     property bool showsSeparator: true
+    property real inset: Theme.margin
 
     implicitHeight: Math.max(60, texts.implicitHeight + 3 * Theme.grid)
     Accessible.role: Accessible.ListItem
@@ -20,8 +21,8 @@ Item {
 
         anchors.left: parent.left
         anchors.right: spinner.visible ? spinner.left : parent.right
-        anchors.leftMargin: Theme.margin
-        anchors.rightMargin: Theme.margin
+        anchors.leftMargin: cell.inset
+        anchors.rightMargin: cell.inset
         anchors.verticalCenter: parent.verticalCenter
         spacing: Theme.grid
 
@@ -78,7 +79,7 @@ Item {
         id: spinner
 
         anchors.right: parent.right
-        anchors.rightMargin: Theme.margin
+        anchors.rightMargin: cell.inset
         anchors.verticalCenter: parent.verticalCenter
         visible: cell.showsActivityIndicator
         isAnimating: visible
@@ -87,7 +88,7 @@ Item {
         objectName: "separatorView"
         anchors.left: parent.left
         anchors.right: parent.right
-        anchors.leftMargin: Theme.margin
+        anchors.leftMargin: cell.inset
         anchors.bottom: parent.bottom
         height: 1
         visible: cell.showsSeparator

@@ -7,6 +7,8 @@ Rectangle {
 
     required property ShellBinding shell
     property string title
+    // The title while it is large, where a screen says more in it.
+    property string longTitle: title
     property bool showsBack: false
     property bool prefersLargeTitle: true
     // The screen's list, if it has one.
@@ -86,7 +88,7 @@ Rectangle {
         x: Theme.margin
         width: parent.width - Theme.margin - Math.max(Theme.margin, bar.trailingWidth)
         height: bar.largeHeight
-        text: bar.title
+        text: bar.longTitle
         textFormat: Text.PlainText
         font.pixelSize: Theme.largeTitle
         font.bold: true
@@ -96,7 +98,7 @@ Rectangle {
         elide: Text.ElideMiddle
         verticalAlignment: Text.AlignVCenter
         Accessible.role: Accessible.Heading
-        Accessible.name: bar.title
+        Accessible.name: bar.longTitle
     }
     Item {
         id: trailing

@@ -61,6 +61,7 @@ FocusScope {
         shell: page.shell
         width: parent.width
         title: page.screen && page.screen.title !== undefined ? page.screen.title : ""
+        longTitle: page.screen && page.screen.longTitle !== undefined ? page.screen.longTitle : title
         flickable: page.screen && page.screen.flickable ? page.screen.flickable : null
         showsBack: true
         onBackPressed: page.backPressed()

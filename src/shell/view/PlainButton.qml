@@ -22,7 +22,7 @@ AbstractButton {
     background: Rectangle {
         radius: button.radius
         color: button.hovered && button.enabled ? Theme.bar : "transparent"
-        border.width: button.visualFocus ? 2 : 0
+        border.width: button.activeFocus && FocusRing.isShown ? 2 : 0
         border.color: button.focusColor
     }
 }

@@ -10,6 +10,9 @@ FocusScope {
     property real presence: 1
     property bool isLeaving: false
 
+    // A screen that is done in less says so.
+    readonly property real sheetHeight: screen.sheetHeight === undefined ? 760 : screen.sheetHeight + 2 * place.anchors.margins
+
     readonly property bool isSheet: width >= Theme.wideWidth
 
     signal gone
@@ -61,7 +64,7 @@ FocusScope {
         id: content
 
         width: sheet.isSheet ? Math.min(sheet.width - 4 * Theme.margin, 640) : sheet.width
-        height: sheet.isSheet ? Math.min(sheet.height - 4 * Theme.margin, 760) : sheet.height
+        height: sheet.isSheet ? Math.min(sheet.height - 4 * Theme.margin, sheet.sheetHeight) : sheet.height
         x: (sheet.width - width) / 2
         y: (sheet.height - height) / 2 + (1 - sheet.presence) * (sheet.height + height) / 2
         radius: sheet.isSheet ? Theme.margin : 0

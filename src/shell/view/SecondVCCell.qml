@@ -42,7 +42,7 @@ T.AbstractButton {
     }
 
     background: Rectangle {
-        color: cell.visualFocus ? Theme.card : "transparent"
+        color: cell.activeFocus && FocusRing.isShown ? Theme.card : "transparent"
 
         Rectangle {
             objectName: "separatorView"

@@ -12,7 +12,7 @@ QtObject {
     readonly property color content: isDark ? "#C2CBD6" : "#3A4453"
     readonly property color header: isDark ? "#93A0B0" : "#566273"
     readonly property color buttonNormal: isDark ? "#778392" : "#7A8594"
-    readonly property color buttonSelected: isDark ? "#FF9B45" : "#C2410C"
+    readonly property color buttonSelected: isDark ? "#FF9B45" : "#B63C0B"
     readonly property color subtitleNumbers: isDark ? "#67D4E6" : "#0B6478"
 
     // Surfaces are "Background" with a little "Title" in it.

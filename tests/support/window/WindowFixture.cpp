@@ -17,6 +17,7 @@
 #include "screens/export/view/SaveText.h"
 #include "shell/Window.h"
 #include "shell/view/Appearance.h"
+#include "shell/view/FocusRing.h"
 #include "shell/view/QmlModule.h"
 
 namespace quorl::test {
@@ -119,6 +120,7 @@ WindowPhone::WindowPhone()
   appearance.setDark(false);
   appearance.setFontScale(1);
   appearance.setReducedMotion(false);
+  view::FocusRing::shared().setShown(false);
 }
 
 WindowPhone::~WindowPhone() {

@@ -139,12 +139,13 @@ FocusScope {
                 SymbolButton {
                     id: deleteButton
 
+                    readonly property bool isUnderKeys: FocusRing.isShown && list.activeFocus && row.ListView.isCurrentItem
+
                     objectName: "deleteButton"
                     anchors.right: parent.right
                     anchors.verticalCenter: parent.verticalCenter
-                    visible: row.hovered || row.activeFocus
-                    focusPolicy: Qt.NoFocus
-                    activeFocusOnTab: false
+                    visible: row.hovered || isUnderKeys
+                    focusPolicy: Qt.TabFocus
                     symbol: "trash"
                     text: qsTr("Delete %1").arg(row.name)
                     onClicked: root.binding.swipeToDelete(row.index)
@@ -153,7 +154,7 @@ FocusScope {
 
             background: Rectangle {
                 color: row.down ? Theme.mixed(Theme.background, Theme.title, 0.08) : Theme.background
-                border.width: row.visualFocus ? 2 : 0
+                border.width: row.activeFocus && FocusRing.isShown ? 2 : 0
                 border.color: Theme.buttonSelected
 
                 Rectangle {

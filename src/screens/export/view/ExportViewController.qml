@@ -8,6 +8,8 @@ FocusScope {
 
     required property ExportBinding binding
     property var navigation
+    // With room for the loading view.
+    readonly property real sheetHeight: options.y + options.height + 12 * Theme.grid + loading.height
 
     objectName: "ExportViewController"
     Component.onDestruction: binding.leave()
@@ -79,7 +81,7 @@ FocusScope {
 
                 background: Rectangle {
                     color: option.pressed ? Theme.pressed : "transparent"
-                    border.width: option.visualFocus ? 2 : 0
+                    border.width: option.activeFocus && FocusRing.isShown ? 2 : 0
                     border.color: Theme.buttonSelected
 
                     Rectangle {
@@ -116,6 +118,8 @@ FocusScope {
     }
 
     LoadingView {
+        id: loading
+
         objectName: "exportLoading"
         anchors.top: options.bottom
         anchors.topMargin: 6 * Theme.grid

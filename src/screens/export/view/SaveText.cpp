@@ -50,6 +50,10 @@ QString SaveText::path() const {
 }
 
 void SaveText::save() {
+  if (!QDir::isAbsolutePath(folder_)) {
+    show(Stage::Asking, tr("A folder is given by its whole path, from “/” on. Nothing was written. Choose one."));
+    return;
+  }
   if (fileName_.trimmed().isEmpty() || fileName_.contains(QLatin1Char('/')) || fileName_ == QLatin1String("..") ||
       fileName_ == QLatin1String(".")) {
     show(Stage::Asking, tr("A file needs a name without “/”. Nothing was written. Give it another name."));

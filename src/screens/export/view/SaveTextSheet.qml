@@ -19,7 +19,16 @@ Popup {
     focus: true
     closePolicy: Popup.NoAutoClose
     visible: stage !== SaveText.Closed
-    onOpened: nameField.forceActiveFocus()
+    onOpened: focusStage()
+    onStageChanged: if (opened) Qt.callLater(focusStage)
+
+    // Where the keyboard goes on: a field, or the button that does no harm.
+    function focusStage() {
+        if (asks)
+            nameField.forceActiveFocus()
+        else if (stage !== SaveText.Closed)
+            cancelButton.forceActiveFocus()
+    }
 
     T.Overlay.modal: Rectangle { color: Theme.veil }
     background: Rectangle {
@@ -57,6 +66,7 @@ Popup {
     contentItem: Column {
         id: column
 
+        objectName: "saveSheetContent"
         spacing: 2 * Theme.grid
         Keys.onEscapePressed: sheet.stage === SaveText.Replacing ? SaveText.keep() : SaveText.close()
 
@@ -130,6 +140,8 @@ Popup {
             spacing: 2 * Theme.grid
 
             TextButton {
+                id: cancelButton
+
                 objectName: "cancelSaveButton"
                 text: sheet.stage === SaveText.Replacing ? qsTr("Keep") : sheet.asks ? qsTr("Cancel") : qsTr("Done")
                 onClicked: sheet.stage === SaveText.Replacing ? SaveText.keep() : SaveText.close()

@@ -8,34 +8,17 @@ FocusScope {
     required property AttributeContentDetailsBinding binding
     property var navigation
     readonly property string title: binding.title
+    // The header over the graph is the screen's large title.
+    readonly property string longTitle: binding.headerText
 
     objectName: "AttributeContentDetailsViewController"
     Component.onDestruction: binding.leave()
-
-    Text {
-        id: header
-
-        objectName: "historyHeader"
-        anchors.top: parent.top
-        anchors.left: parent.left
-        anchors.right: parent.right
-        anchors.margins: Theme.margin
-        text: root.binding.headerText
-        font.pixelSize: Theme.largeTitle
-        font.weight: Font.Bold
-        fontSizeMode: Text.HorizontalFit
-        minimumPixelSize: Theme.section
-        color: Theme.title
-        elide: Text.ElideMiddle
-        textFormat: Text.PlainText
-    }
 
     SegmentedControl {
         id: segments
 
         objectName: "timeFrames"
-        anchors.top: header.bottom
-        anchors.topMargin: 2 * Theme.grid
+        anchors.top: parent.top
         x: Theme.margin
         width: Math.min(480, parent.width - 2 * Theme.margin)
         labels: root.binding.segments

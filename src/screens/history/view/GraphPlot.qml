@@ -7,7 +7,8 @@ FocusScope {
     id: root
 
     required property AttributeContentDetailsBinding binding
-    readonly property real barPitch: binding.barWidth + 1.5 * Theme.grid
+    // Bars stand as far apart as a finger needs.
+    readonly property real barPitch: Math.max(Theme.touch, binding.barWidth + Theme.grid)
     readonly property real labelHeight: metrics.height + 2 * Theme.grid
     readonly property real labelWidth: metrics.advanceWidth(binding.widestLabel)
     readonly property int labelStride: binding.labelStride(labelWidth, barPitch)
@@ -100,8 +101,18 @@ FocusScope {
         Accessible.role: Accessible.Chart
         Accessible.name: root.binding.headerText + ", " + root.binding.captionText
         onCurrentIndexChanged: if (activeFocus && currentIndex >= 0) root.binding.tapBar(currentIndex)
-        onCountChanged: positionViewAtEnd()
-        Component.onCompleted: positionViewAtEnd()
+        onCountChanged: showLatest()
+        onWidthChanged: showLatest()
+        onRightMarginChanged: showLatest()
+        Component.onCompleted: showLatest()
+
+        // The latest reading, or the selected one, whatever room the axis and the window leave.
+        function showLatest() {
+            if (root.binding.selectedIndex < 0)
+                positionViewAtEnd()
+            else
+                positionViewAtIndex(root.binding.selectedIndex, ListView.Contain)
+        }
 
         delegate: T.AbstractButton {
             id: bar
@@ -140,8 +151,10 @@ FocusScope {
                 objectName: "barLabel"
                 anchors.horizontalCenter: parent.horizontalCenter
                 y: plot.height + Theme.grid
-                visible: bar.index % root.labelStride === 0
-                text: visible ? bar.label : ""
+                // None that the edge would cut.
+                visible: bar.index % root.labelStride === 0 && bar.x + x >= list.contentX
+                         && bar.x + x + metrics.advanceWidth(bar.label) <= list.contentX + list.width
+                text: bar.label
                 font.pixelSize: Theme.caption
                 color: bar.selected ? Theme.buttonSelected : Theme.header
             }

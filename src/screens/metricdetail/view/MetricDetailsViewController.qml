@@ -101,12 +101,14 @@ FocusScope {
             SymbolButton {
                 objectName: "graphButton"
                 visible: row.showsGraph
+                activeFocusOnTab: row.ListView.isCurrentItem
                 symbol: "arrow.right.circle"
                 text: qsTr("History of %1").arg(row.name)
                 onClicked: root.binding.tapGraph(row.index)
             }
             SymbolButton {
                 objectName: "bookmarkButton"
+                activeFocusOnTab: row.ListView.isCurrentItem
                 symbol: row.bookmarked ? "bookmark.fill" : "bookmark"
                 tint: row.bookmarked ? Theme.buttonSelected : Theme.buttonNormal
                 text: row.bookmarked ? qsTr("Remove %1 from dashboard").arg(row.name)

@@ -211,7 +211,7 @@ FocusScope {
 
             background: Rectangle {
                 color: row.pressed ? Theme.pressed : row.isSelected ? Theme.card : "transparent"
-                border.width: row.visualFocus ? 2 : 0
+                border.width: row.activeFocus && FocusRing.isShown ? 2 : 0
                 border.color: Theme.buttonSelected
 
                 Rectangle {
