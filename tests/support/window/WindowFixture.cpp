@@ -2,6 +2,7 @@
 
 #include <QAnimationDriver>
 #include <QCoreApplication>
+#include <QSignalSpy>
 #include <QStyleHints>
 #include <QTest>
 #include <QVariantAnimation>
@@ -223,7 +224,8 @@ void WindowPhone::longPress(QQuickItem* item) {
   hints.setMousePressAndHoldInterval(1);
   const QPoint at = middleOf(item);
   QTest::mousePress(window_, Qt::LeftButton, Qt::NoModifier, at);
-  QTest::qWait(20);
+  const QSignalSpy held(item, SIGNAL(pressAndHold()));
+  QTest::qWaitFor([&] { return !held.empty(); });
   QTest::mouseRelease(window_, Qt::LeftButton, Qt::NoModifier, at);
   hints.setMousePressAndHoldInterval(usual);
   settle();
