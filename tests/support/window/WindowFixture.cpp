@@ -226,6 +226,7 @@ void WindowPhone::longPress(QQuickItem* item) {
   QTest::mousePress(window_, Qt::LeftButton, Qt::NoModifier, at);
   const QSignalSpy held(item, SIGNAL(pressAndHold()));
   QTest::qWaitFor([&] { return !held.empty(); });
+  QTest::qWait(50);
   QTest::mouseRelease(window_, Qt::LeftButton, Qt::NoModifier, at);
   hints.setMousePressAndHoldInterval(usual);
   settle();
