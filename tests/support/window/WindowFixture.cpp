@@ -225,8 +225,7 @@ void WindowPhone::longPress(QQuickItem* item) {
   const QPoint at = middleOf(item);
   QTest::mousePress(window_, Qt::LeftButton, Qt::NoModifier, at);
   const QSignalSpy held(item, SIGNAL(pressAndHold()));
-  QTest::qWaitFor([&] { return !held.empty(); });
-  QTest::qWait(50);
+  EXPECT_TRUE(QTest::qWaitFor([&] { return !held.empty(); }));
   QTest::mouseRelease(window_, Qt::LeftButton, Qt::NoModifier, at);
   hints.setMousePressAndHoldInterval(usual);
   settle();
