@@ -4,7 +4,7 @@
 // Tells for each simulated hour the memory, the deepest each queue was, and the longest that one task held the main
 // thread; in the end whether a row is missing. What ought to be there is counted by a process that only decodes.
 //
-//   bench_load [SCENARIO [MINUTES]]      a folder of its own in QUORL_BENCH_DIR holds the rows
+//   bench_load [SCENARIO [MINUTES]]      six seconds of "busy" by default; QUORL_BENCH_DIR holds the rows
 
 #include <algorithm>
 #include <atomic>
@@ -397,6 +397,6 @@ double megabytes(std::string_view field) {
 
 int main(int argc, char** argv) {
   const bool isNamed = argc > 1 && argv[1][0] != '-';
-  const double minutes = isNamed && argc > 2 ? std::strtod(argv[2], nullptr) : 0.5;
-  quorl::run(isNamed ? argv[1] : "hostile", std::chrono::seconds(std::max(1LL, std::llround(minutes * 60))));
+  const double minutes = isNamed && argc > 2 ? std::strtod(argv[2], nullptr) : 0.1;
+  quorl::run(isNamed ? argv[1] : "busy", std::chrono::seconds(std::max(1LL, std::llround(minutes * 60))));
 }
