@@ -1,5 +1,5 @@
 # What makes a fault harder to use by somebody who found one. The sanitizers' builds go without.
-option(QUORL_HARDENED "Compile the product with stack protection and checked library calls" OFF)
+option(QUORL_HARDENED "Compile the product with stack protection and checked library calls" ON)
 
 if(NOT QUORL_SANITIZE AND NOT QUORL_FUZZ)
   # Programs can be loaded anywhere, and what links them to libraries is read-only before main.
