@@ -348,6 +348,7 @@ TEST(ScenarioFiles, OneThatIsNotThereNamesThoseThatAre) {
   ASSERT_EQ(missing.error().size(), 1U);
   EXPECT_TRUE(missing.error()[0].starts_with("there is no scenario \"moon\", but busy, city, ")) << missing.error()[0];
   EXPECT_FALSE(findScenario("./moon.scenario", {}));
+  EXPECT_EQ(findScenario("city", {}).error()[0], "there is no scenario \"city\", as the shipped ones are missing");
 }
 
 }  // namespace

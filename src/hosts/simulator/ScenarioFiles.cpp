@@ -45,8 +45,10 @@ tl::expected<network::Scenario, std::vector<std::string>> findScenario(std::stri
   const bool isPath = nameOrPath.find('/') != std::string_view::npos || nameOrPath.ends_with(kEnding);
   const fs::path file = isPath ? fs::path(nameOrPath) : fileOf(nameOrPath, resources);
   if (file.empty()) {
+    const std::vector<std::string> known = scenarioNames(resources);
     return tl::unexpected(std::vector{
-        fmt::format("there is no scenario \"{}\", but {}", nameOrPath, fmt::join(scenarioNames(resources), ", "))});
+        known.empty() ? fmt::format("there is no scenario \"{}\", as the shipped ones are missing", nameOrPath)
+                      : fmt::format("there is no scenario \"{}\", but {}", nameOrPath, fmt::join(known, ", "))});
   }
   network::ScenarioReading reading = network::readScenario(file);
   if (reading.problems.empty()) return std::move(reading.scenario);
