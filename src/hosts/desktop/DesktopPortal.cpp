@@ -35,13 +35,12 @@ QVariant unwrapped(QVariant value) {
 
 }  // namespace
 
-DesktopPortal* DesktopPortal::ofSession(QObject* parent) {
+DesktopPortal* DesktopPortal::ofSession() {
   if (!hasSessionBus()) return nullptr;
-  return new DesktopPortal(QDBusConnection::sessionBus(), kService, parent);
+  return new DesktopPortal(QDBusConnection::sessionBus(), kService);
 }
 
-DesktopPortal::DesktopPortal(const QDBusConnection& bus, const QString& service, QObject* parent)
-    : QObject(parent), bus_(bus), service_(service) {
+DesktopPortal::DesktopPortal(const QDBusConnection& bus, const QString& service) : bus_(bus), service_(service) {
   bus_.connect(service, kPath, kInterface, "SettingChanged", this,
                SLOT(settingDidChange(QString, QString, QDBusVariant)));
   ask(kAppearance, kColorScheme);

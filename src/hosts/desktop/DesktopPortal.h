@@ -15,9 +15,9 @@ class DesktopPortal final : public QObject {
 
  public:
   /// The session's portal; where there is no session bus, nothing is ever known.
-  static DesktopPortal* ofSession(QObject* parent);
+  static DesktopPortal* ofSession();
   /// Asks the portal of that service, and follows it from now on. Answers come later.
-  DesktopPortal(const QDBusConnection& bus, const QString& service, QObject* parent = nullptr);
+  DesktopPortal(const QDBusConnection& bus, const QString& service);
 
   /// Nothing while it is not known, or where the user has no preference.
   std::optional<bool> isDark() const { return isDark_; }

@@ -29,9 +29,9 @@ struct PlayedRadio::State {
   std::size_t next = 0;
 };
 
-PlayedRadio::PlayedRadio(Programme programme, Phone phone)
-    : state_(std::make_shared<State>(State{std::move(programme.events), programme.speed, phone})) {
-  phone.telephony.play(atSpeed(std::move(programme.steps), programme.speed), phone.mainQueue);
+PlayedRadio::PlayedRadio(std::vector<simulator::RecordedEvent> events, Steps steps, double speed, Phone phone)
+    : state_(std::make_shared<State>(State{std::move(events), speed, phone})) {
+  phone.telephony.play(atSpeed(std::move(steps), speed), phone.mainQueue);
 }
 
 PlayedRadio::~PlayedRadio() = default;

@@ -18,11 +18,6 @@ namespace quorl::desktop {
 class PlayedRadio {
  public:
   using Steps = std::vector<simulator::TelephonyScriptStep>;
-  struct Programme {
-    std::vector<simulator::RecordedEvent> events;  // in order of time
-    Steps steps;
-    double speed = 1;  // above 0
-  };
   struct Phone {
     simulator::BasebandManager& baseband;
     simulator::TelephonySimulator& telephony;
@@ -30,8 +25,9 @@ class PlayedRadio {
     const Clock& clock;
   };
 
-  /// The phone must outlive it. How the SIMs are found at the start is so from here on.
-  PlayedRadio(Programme programme, Phone phone);
+  /// Plays events, in order of time, and steps so many times as fast as they were, which is above 0. The phone must
+  /// outlive it. How the SIMs are found at the start is so from here on.
+  PlayedRadio(std::vector<simulator::RecordedEvent> events, Steps steps, double speed, Phone phone);
   ~PlayedRadio();
   PlayedRadio(const PlayedRadio&) = delete;
   PlayedRadio& operator=(const PlayedRadio&) = delete;

@@ -2,6 +2,8 @@
 
 #include <QCoreApplication>
 #include <chrono>
+#include <future>
+#include <memory>
 #include <utility>
 
 #include "hosts/desktop/QtQueue.h"
@@ -43,10 +45,8 @@ SimulatedDesktop::~SimulatedDesktop() {
 tl::expected<void, std::string> SimulatedDesktop::tuneIn(Programme programme) {
   const bool hasScript = programme.telephony.has_value();
   if (hasScript || !programme.events.empty())
-    played_.emplace(
-        PlayedRadio::Programme{std::move(programme.events),
-                               std::move(programme.telephony).value_or(PlayedRadio::Steps()), programme.speed},
-        PlayedRadio::Phone{baseband_, telephony_, mainQueue_, clock_});
+    played_.emplace(std::move(programme.events), std::move(programme.telephony).value_or(PlayedRadio::Steps()),
+                    programme.speed, PlayedRadio::Phone{baseband_, telephony_, mainQueue_, clock_});
   if (programme.scenario) {
     auto made =
         simulator::LiveScenario::make({*std::move(programme.scenario), programme.speed, std::move(programme.record)},
@@ -66,13 +66,21 @@ void SimulatedDesktop::startRadio() {
 }
 
 tl::expected<void, std::string> SimulatedDesktop::stopRadio() {
+  using Outcome = simulator::RecordingWriter::Outcome;
   played_.reset();
-  if (!scenario_) return {};
-  scenario_->stop();
-  simulator::RecordingWriter::Outcome outcome;
-  scenario_->finishRecording([&](simulator::RecordingWriter::Outcome so) { outcome = std::move(so); });
+  // The modem tells from its own queue, and may do so after a rest that did not come.
+  const auto ended = std::make_shared<std::promise<Outcome>>();
+  std::future<Outcome> outcome = ended->get_future();
+  if (scenario_) {
+    scenario_->stop();
+    scenario_->finishRecording([ended](Outcome so) { ended->set_value(std::move(so)); });
+  } else {
+    ended->set_value({});
+  }
   comeToRest();
-  return outcome;
+  if (outcome.wait_for(std::chrono::seconds(0)) != std::future_status::ready)
+    return tl::unexpected(std::string("not ended in time"));
+  return outcome.get();
 }
 
 void SimulatedDesktop::comeToRest() const {

@@ -19,6 +19,8 @@
 namespace quorl::desktop {
 namespace {
 
+using simulator::metrics::Family;
+
 constexpr char kUnknownChipset[] = "none";
 constexpr char kUsualScenario[] = "city";
 
@@ -65,8 +67,11 @@ std::string joined(const std::vector<std::string>& texts, const char* between) {
   return fmt::format("{}", fmt::join(texts, between));
 }
 
-bool isIce(const simulator::DeviceDescription& device) {
-  return device.chipset && device.chipset->find("ice") != std::string::npos;
+std::optional<Family> familyOf(const simulator::DeviceDescription& device) {
+  const std::string chipset = device.chipset.value_or("");
+  if (chipset.find("ice") != std::string::npos) return Family::Ice;
+  if (chipset.find("mav") != std::string::npos) return Family::Mav;
+  return std::nullopt;
 }
 
 tl::expected<simulator::ScenarioChoice, std::string> scenarioOf(const SimulatorOptions& options) {
@@ -76,9 +81,7 @@ tl::expected<simulator::ScenarioChoice, std::string> scenarioOf(const SimulatorO
     for (std::size_t slot = static_cast<std::size_t>(*options.sims); slot < scenario->sims.size(); ++slot)
       scenario->sims[slot].isPresent = false;
   keepSims(scenario->steps, options.sims);
-  return simulator::ScenarioChoice{
-      *std::move(scenario), options.seed,
-      isIce(options.device) ? simulator::metrics::Family::Ice : simulator::metrics::Family::Mav};
+  return simulator::ScenarioChoice{*std::move(scenario), options.seed, familyOf(options.device).value_or(Family::Mav)};
 }
 
 tl::expected<std::vector<simulator::RecordedEvent>, std::string> recordingOf(const std::filesystem::path& file) {
@@ -174,8 +177,7 @@ tl::expected<Programme, std::string> SimulatorOptions::programme() const {
 }
 
 std::optional<simulator::HistoryPlan> SimulatorOptions::history(const Programme& programme, Date until) const {
-  const bool hasFamily = device.chipset && (isIce(device) || device.chipset->find("mav") != std::string::npos);
-  if (!hasFamily || !programme.scenario || historyDays == 0) return std::nullopt;
+  if (!familyOf(device) || !programme.scenario || historyDays == 0) return std::nullopt;
   return simulator::HistoryPlan{*programme.scenario, historyDays, until};
 }
 

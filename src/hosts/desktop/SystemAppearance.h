@@ -11,7 +11,7 @@ namespace quorl::desktop {
 class SystemAppearance final : public QObject {
  public:
   /// Follows the application and the session's portal from now on.
-  SystemAppearance() : SystemAppearance(DesktopPortal::ofSession(nullptr)) {}
+  SystemAppearance() : SystemAppearance(DesktopPortal::ofSession()) {}
   /// Follows the application and `portal`, which may be null and belongs to it from now on. What the portal does not
   /// know is as the application's palette has it.
   explicit SystemAppearance(DesktopPortal* portal);

@@ -105,7 +105,8 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
   }
   const int code = application.exec();
   lifecycle.terminate();
-  if (const auto whole = phone->stopRadio(); !whole) return fail(options.record.string() + ": " + whole.error());
+  if (const auto whole = phone->stopRadio(); !whole && !options.record.empty())
+    return fail(options.record.string() + ": " + whole.error());
   return code;
 }
 
