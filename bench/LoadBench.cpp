@@ -26,6 +26,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "NoStore.h"
 #include "StoreBench.h"
 #include "app/AppDelegate.h"
 #include "app/ApplicationLoop.h"
@@ -178,8 +179,8 @@ struct FailureLog final : LogSink {
   std::atomic<std::size_t> failures{0};
 };
 
-/// A store that only counts.
-class CountingStore final : public PersistanceStoreProtocol {
+/// Only counts.
+class CountingStore final : public bench::NoStore {
  public:
   void insertMetric(Metric metric, WriteCompletion /*completion*/) override {
     // A damaged payload may name a year that the table cannot hold.
@@ -189,14 +190,6 @@ class CountingStore final : public PersistanceStoreProtocol {
       ++impossibleRows;
     }
   }
-  void fetchAvailableMetrics(std::int32_t /*subsId*/, AvailableMetricsCompletion /*completion*/) override {}
-  void fetchMetricContents(std::string_view /*tech*/, std::string_view /*name*/,
-                           std::optional<std::string_view> /*attribute*/, std::int32_t /*subsId*/,
-                           MetricsCompletion /*completion*/) override {}
-  void fetchAttributeHistory(std::string_view /*name*/, std::string_view /*attribute*/,
-                             AttributeDetailTimeFrame /*timeFrame*/, MetricsCompletion /*completion*/) override {}
-  void fetchDashboard(std::int32_t /*subsId*/, DashboardCompletion /*completion*/) override {}
-  void exportMetrics(AttributeDetailTimeFrame /*timeFrame*/, ExportCompletion /*completion*/) override {}
 
   std::size_t rows = 0;
   std::size_t impossibleRows = 0;

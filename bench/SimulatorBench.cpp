@@ -13,6 +13,7 @@
 #include <fmt/format.h>
 #include <sqlite3.h>
 
+#include "NoStore.h"
 #include "base/Uuid.h"
 #include "hosts/simulator/ScenarioFiles.h"
 #include "hosts/simulator/ScenarioRun.h"
@@ -38,20 +39,6 @@ std::vector<RecordedEvent> eventsOf(const ScenarioChoice& choice) {
   return events;
 }
 
-/// Swallows rows.
-class NoStore final : public PersistanceStoreProtocol {
- public:
-  void insertMetric(Metric metric, WriteCompletion /*completion*/) override { benchmark::DoNotOptimize(metric); }
-  void fetchAvailableMetrics(std::int32_t /*subsId*/, AvailableMetricsCompletion /*completion*/) override {}
-  void fetchMetricContents(std::string_view /*metricTech*/, std::string_view /*metricName*/,
-                           std::optional<std::string_view> /*attributeName*/, std::int32_t /*subsId*/,
-                           MetricsCompletion /*completion*/) override {}
-  void fetchAttributeHistory(std::string_view /*metricName*/, std::string_view /*attributeName*/,
-                             AttributeDetailTimeFrame /*timeFrame*/, MetricsCompletion /*completion*/) override {}
-  void fetchDashboard(std::int32_t /*subsId*/, DashboardCompletion /*completion*/) override {}
-  void exportMetrics(AttributeDetailTimeFrame /*timeFrame*/, ExportCompletion /*completion*/) override {}
-};
-
 std::string rateName(std::string_view what) {
   return std::string(what) + "/s";
 }
@@ -70,7 +57,7 @@ void simulated(benchmark::State& state, const ScenarioChoice& choice) {
 
 void taken(benchmark::State& state, const ScenarioChoice& choice) {
   const auto events = eventsOf(choice);
-  NoStore store;
+  bench::NoStore store;
   const auto service = MetricService::make(store, ZelkorWrapper::sharedInstance());
   std::uint64_t metrics = 0;
   for ([[maybe_unused]] auto _ : state) {

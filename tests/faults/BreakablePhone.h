@@ -25,6 +25,7 @@
 #include "store/PersistanceStore.h"
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
+#include "support/PassingLibrary.h"
 #include "support/TimeZone.h"
 #include "support/VirtualTimeVfs.h"
 
@@ -55,35 +56,22 @@ class ErrorLines final : public LogSink {
 };
 
 /// A baseband manager that can be told to refuse, to be slow, and to fall silent.
-class UnwillingManager final : public zelkor::client::Library {
+class UnwillingManager final : public PassingLibrary {
  public:
-  explicit UnwillingManager(simulator::BasebandManager& manager) : manager_(manager) {}
+  using PassingLibrary::PassingLibrary;
 
-  std::shared_ptr<zelkor::client::Manager> CreateManager(std::string_view clientName,
-                                                         std::shared_ptr<Queue> queue) override {
-    return manager_.CreateManager(clientName, std::move(queue));
-  }
-  void RegisterEventHandler(const std::shared_ptr<zelkor::client::Manager>& manager, std::string_view event,
-                            zelkor::client::EventHandler handler) override {
-    manager_.RegisterEventHandler(manager, event, std::move(handler));
-  }
-  void EventsOff(const std::shared_ptr<zelkor::client::Manager>& manager) override { manager_.EventsOff(manager); }
-  void EventsOn(const std::shared_ptr<zelkor::client::Manager>& manager) override { manager_.EventsOn(manager); }
   zelkor::client::Result PerformCommand(const std::shared_ptr<zelkor::client::Manager>& manager,
                                         std::string_view command, const zelkor::KeyValueMessage& message,
                                         zelkor::KeyValueMessage& response) override {
     ++commands[std::string(command)];
     if (duringCommand) duringCommand();
     if (refusal) return *refusal;
-    return manager_.PerformCommand(manager, command, message, response);
+    return PassingLibrary::PerformCommand(manager, command, message, response);
   }
 
   std::optional<zelkor::client::Result> refusal;  // the answer to every command, none of which is carried out
   std::function<void()> duringCommand;
   std::map<std::string, int, std::less<>> commands;
-
- private:
-  simulator::BasebandManager& manager_;
 };
 
 /// The whole product, started as a host starts it, on a phone whose parts a test can break: a real database file,

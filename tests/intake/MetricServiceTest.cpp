@@ -8,6 +8,7 @@
 #include "intake/IntakeFixture.h"
 #include "intake/MetricService.h"
 #include "shell/NotificationNames.h"
+#include "support/PassingLibrary.h"
 
 namespace quorl::test {
 namespace {
@@ -42,32 +43,16 @@ std::vector<LogLine> linesOfTheWalk(const LogRecorder& log) {
 }
 
 /// Passes everything on and looks who is the delegate when events are turned on.
-class WatchingLibrary final : public zelkor::client::Library {
+class WatchingLibrary final : public test::PassingLibrary {
  public:
-  explicit WatchingLibrary(Library& inner) : inner_(inner) {}
-  std::shared_ptr<zelkor::client::Manager> CreateManager(std::string_view clientName,
-                                                         std::shared_ptr<Queue> queue) override {
-    return inner_.CreateManager(clientName, std::move(queue));
-  }
-  void RegisterEventHandler(const std::shared_ptr<zelkor::client::Manager>& manager, std::string_view event,
-                            zelkor::client::EventHandler handler) override {
-    inner_.RegisterEventHandler(manager, event, std::move(handler));
-  }
-  void EventsOff(const std::shared_ptr<zelkor::client::Manager>& manager) override { inner_.EventsOff(manager); }
+  using PassingLibrary::PassingLibrary;
+
   void EventsOn(const std::shared_ptr<zelkor::client::Manager>& manager) override {
     hadDelegate = ZelkorWrapper::sharedInstance().delegate() != nullptr;
-    inner_.EventsOn(manager);
-  }
-  zelkor::client::Result PerformCommand(const std::shared_ptr<zelkor::client::Manager>& manager,
-                                        std::string_view command, const KeyValueMessage& message,
-                                        KeyValueMessage& response) override {
-    return inner_.PerformCommand(manager, command, message, response);
+    PassingLibrary::EventsOn(manager);
   }
 
   std::optional<bool> hadDelegate;
-
- private:
-  Library& inner_;
 };
 
 TEST_F(MetricServiceTest, ConstructionListensBeforeItBecomesTheDelegateAndThenLogs) {
