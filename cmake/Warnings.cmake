@@ -4,6 +4,11 @@ target_compile_options(quorl_flags INTERFACE -Wall -Wextra -Wpedantic -Wconversi
                                              -Wnon-virtual-dtor -Woverloaded-virtual -Wold-style-cast
                                              -Wimplicit-fallthrough -Werror)
 
+if(CMAKE_UNITY_BUILD AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+  # GCC takes what a joined file includes for a header, whose classes may hold no type of an unnamed namespace.
+  target_compile_options(quorl_flags INTERFACE -Wno-subobject-linkage)
+endif()
+
 if(QUORL_SANITIZE)
   # Reports need no more than line numbers; the rest of the debug information takes a third of the time.
   add_compile_options(-fsanitize=${QUORL_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer -O1 -g1)

@@ -4,23 +4,15 @@
 
 #include "app/HardwareManager.h"
 #include "base/FatalStop.h"
-#include "base/Log.h"
 #include "intake/MetricChannel.h"
 #include "intake/ZelkorWrapper.h"
 #include "platform/Platform.h"
 #include "shell/AnalyticsManager.h"
 #include "shell/BaseViewController.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "store/PersistanceStore.h"
 
 namespace quorl {
-namespace {
-
-constexpr Logger generalLog{log_category::kGeneral};
-constexpr Logger metricRelatedLog{log_category::kMetricRelated};
-
-}  // namespace
-
 bool AppDelegate::onLaunch() {
   window_ = std::make_unique<Window>();
   HardwareManager& hardware = HardwareManager::shared();

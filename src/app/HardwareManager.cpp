@@ -3,16 +3,12 @@
 #include <memory>
 #include <mutex>
 
-#include "base/Log.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger generalLog{log_category::kGeneral};
-constexpr Logger sondrelLog{log_category::kSondrel};
 
 constexpr char kUnknown[] = "unknown";
 constexpr char kTabletClass[] = "Tabrin";

@@ -4,15 +4,12 @@
 #include <utility>
 #include <variant>
 
-#include "base/Log.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger sondrelLog{log_category::kSondrel};
 
 /// All elements as `T`; nothing when there is no list or one of them is something else.
 template <typename T>

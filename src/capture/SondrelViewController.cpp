@@ -6,15 +6,11 @@
 #include <fmt/format.h>
 
 #include "base/DateText.h"
-#include "base/Log.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger appUiLog{log_category::kAppUi};
-constexpr Logger sondrelLog{log_category::kSondrel};
 
 constexpr std::chrono::milliseconds kActionDelay{300};
 constexpr double kChunkFileStep = 32;

@@ -3,18 +3,14 @@
 
 #include <fmt/format.h>
 
-#include "base/Log.h"
 #include "intake/MetricService.h"
 #include "messages/MetricCodable.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 // Metrics that are decoded by a class fixed here instead of the one that the catalogue names.
 
 namespace quorl {
 namespace {
-
-constexpr Logger channelLog{log_category::kMetricRelated};
-constexpr Logger serviceLog{log_category::kMetricService};
 
 constexpr char kHomePlmnListKey[] = "ehplmn_list";
 
@@ -45,7 +41,7 @@ struct EdgeCaseRule {
 
 // 827746 is decoded by the class of the neighbouring id 827747, and 806743 by one whose name differs from the
 // catalogue's in case. Both are meant.
-constexpr EdgeCaseRule kRules[] = {
+constexpr EdgeCaseRule kEdgeCaseRules[] = {
     {827650, "CellularRegisteredPlmnStatus", applyHomePlmnRule},
     {827746, "CellularRatLacSrvInfo", nullptr},
     {806743, "CellularLteConnectionStats", nullptr},
@@ -56,11 +52,11 @@ constexpr EdgeCaseRule kRules[] = {
 
 std::optional<MetricDictionary> MetricService::handleEdgeCaseMetrics(std::int64_t metricId,
                                                                      const zelkor::KeyValueMessage& inputDictionary) {
-  serviceLog.log("exception metric %{public}d", metricId);
-  const auto* rule = std::find_if(std::begin(kRules), std::end(kRules),
+  metricServiceLog.log("exception metric %{public}d", metricId);
+  const auto* rule = std::find_if(std::begin(kEdgeCaseRules), std::end(kEdgeCaseRules),
                                   [&](const EdgeCaseRule& candidate) { return candidate.metricId == metricId; });
-  if (rule == std::end(kRules)) {
-    channelLog.log("handleEdgeCaseMetrics - unable to process metricId: %{public}d ", metricId);
+  if (rule == std::end(kEdgeCaseRules)) {
+    metricRelatedLog.log("handleEdgeCaseMetrics - unable to process metricId: %{public}d ", metricId);
     return std::nullopt;
   }
   const std::unique_ptr<MetricCodable> message = makeMessage(rule->className);

@@ -4,9 +4,9 @@
 
 #include <fmt/format.h>
 
-#include "base/Log.h"
+#include "intake/AttributeKeys.h"
 #include "intake/MetricService.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 // Ice metrics carry their values in a repeated sub-message. The rules here lift its elements to the top and convert raw
 // radio values to physical units. Integer steps are 64-bit, float steps 32-bit arithmetic.
@@ -14,10 +14,6 @@
 namespace quorl {
 namespace {
 
-constexpr Logger serviceLog{log_category::kMetricService};
-
-constexpr char kSubsIdKey[] = "subs_id";
-constexpr char kTimestampKey[] = "timestamp";
 constexpr char kConnectedModeKey[] = "connected_mode";
 
 MetricFloat computed(float value) {
@@ -111,7 +107,7 @@ struct IceRule {
   MetricDictionary (*merge)(MetricDictionaryList elements);
 };
 
-constexpr IceRule kRules[] = {
+constexpr IceRule kIceRules[] = {
     {"3CD50D", "bearer_contexts", nullptr, mergePlain},
     {"3CD313", "scc_list", convertCarrier, mergeNumbered},
     {"3CD30B", "carrier_info", nullptr, mergePlain},
@@ -125,11 +121,11 @@ constexpr IceRule kRules[] = {
 }  // namespace
 
 MetricDictionary MetricService::parseIceMetric(std::string_view hexId, const MetricDictionary& dictionary) {
-  serviceLog.log("MetricService - parseIceMetric - metricID %{public}@", hexId);
-  const auto* rule = std::find_if(std::begin(kRules), std::end(kRules),
+  metricServiceLog.log("MetricService - parseIceMetric - metricID %{public}@", hexId);
+  const auto* rule = std::find_if(std::begin(kIceRules), std::end(kIceRules),
                                   [&](const IceRule& candidate) { return candidate.hexId == hexId; });
   MetricDictionary result;
-  if (rule == std::end(kRules)) return result;
+  if (rule == std::end(kIceRules)) return result;
 
   const MetricValue* value = dictionary.find(rule->listKey);
   if (const auto* list = value != nullptr ? value->get<MetricDictionaryList>() : nullptr) {

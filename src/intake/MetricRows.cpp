@@ -6,21 +6,15 @@
 
 #include <fmt/format.h>
 
-#include "base/Log.h"
 #include "base/NotificationCenter.h"
+#include "intake/AttributeKeys.h"
 #include "intake/MetricService.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger serviceLog{log_category::kMetricService};
-constexpr Logger databaseLog{log_category::kDatabase};
-
-constexpr char kSubsIdKey[] = "subs_id";
-constexpr char kTimestampKey[] = "timestamp";
 
 constexpr char kIntType[] = "INT";
 constexpr char kStringType[] = "STRING";
@@ -67,7 +61,7 @@ std::optional<TypedValue> typedValue(const MetricValue& value) {
 }  // namespace
 
 void MetricService::flattenDictionaryIfNeeded(MetricDictionary source, MetricDictionary& result) {
-  serviceLog.log("MetricService - flattenDictionaryIfNeeded - metricDictionary %{public}@", source);
+  metricServiceLog.log("MetricService - flattenDictionaryIfNeeded - metricDictionary %{public}@", source);
   result.reserve(result.size() + source.size());
   for (const MetricEntry* walked : source.walkOrder()) {
     const auto* nested = walked->value.get<MetricDictionary>();
@@ -77,7 +71,7 @@ void MetricService::flattenDictionaryIfNeeded(MetricDictionary source, MetricDic
       result.set(entry.key, std::move(entry.value));
       continue;
     }
-    serviceLog.log("flattened : %{public}@", FlattenedPairs{*nested});
+    metricServiceLog.log("flattened : %{public}@", FlattenedPairs{*nested});
     for (const MetricEntry* inner : nested->walkOrder())
       result.set(fmt::format("{}_{}", walked->key.view(), inner->key.view()), inner->value);
   }
@@ -95,20 +89,20 @@ void MetricService::insertMetricToDatabase(const MetricDictionary& dictionary, c
   const MetricValue* subscription = dictionary.find(kSubsIdKey);
   const std::optional<std::int32_t> subsId = subscription != nullptr ? subscription->integer32() : std::nullopt;
   if (!subsId) return;
-  serviceLog.log("subsId  ---> %{public}d", *subsId);
+  metricServiceLog.log("subsId  ---> %{public}d", *subsId);
 
   for (const MetricEntry* entry : dictionary.walkOrder()) {
     std::optional<TypedValue> typed = typedValue(entry->value);
     if (!typed) {
-      serviceLog.error("unknown attributevalue  ---> %{public}s", entry->value);
+      metricServiceLog.error("unknown attributevalue  ---> %{public}s", entry->value);
       continue;
     }
     insertNestedRows(entry->value, *subsId, group, date);
     if (typed->value.empty()) {
-      serviceLog.log("attribute value or value type is empty");
+      metricServiceLog.log("attribute value or value type is empty");
       return;
     }
-    serviceLog.log(
+    metricServiceLog.log(
         "metricTech: %{public}s, metricName: %{public}s, attributeName: %{public}s, attributeValue: %{public}s, "
         "attibuteValueType: %{public}s)",
         group.tech, group.name, entry->key.view(), typed->value, typed->type);
@@ -131,7 +125,7 @@ void MetricService::insertMetricToDatabase(const MetricDictionary& dictionary, c
     PersistanceStoreProtocol::WriteCompletion completion = [row = metric](bool success,
                                                                           std::optional<SQLiteError> error) {
       if (!success) {
-        serviceLog.error("error occurred while inserting  ---> %{public}s", error);
+        metricServiceLog.error("error occurred while inserting  ---> %{public}s", error);
         return;
       }
       NotificationCenter::defaultCenter().post(notification::kNewZelkorMetric, {{notification::kMetricObjectKey, row}});

@@ -7,15 +7,11 @@
 #include <fmt/format.h>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
 #include "messages/MetricCodable.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger channelLog{log_category::kMetricRelated};
-constexpr Logger serviceLog{log_category::kMetricService};
 
 constexpr char kMarker[] = "validator - metric name: %@, dictionary: %@";
 
@@ -39,7 +35,7 @@ std::string logText(const TechAndName& text) {
 
 /// A row that could not be decoded. The word exception is all there is of one.
 void logException(std::int64_t metricId) {
-  serviceLog.log("MetricService - processMetric - exception - metricID %{public}d", metricId);
+  metricServiceLog.log("MetricService - processMetric - exception - metricID %{public}d", metricId);
 }
 
 template <typename Container, typename Value>
@@ -52,7 +48,7 @@ bool contains(const Container& container, const Value& value) {
 std::shared_ptr<MetricService> MetricService::make(PersistanceStoreProtocol& store, ZelkorWrapper& zelkor) {
   const std::shared_ptr<MetricService> service(new MetricService(store, zelkor));
   zelkor.setDelegate(service);
-  serviceLog.log("MetricService -  init()");
+  metricServiceLog.log("MetricService -  init()");
   return service;
 }
 
@@ -71,12 +67,12 @@ void MetricService::metricsDidUpdate(const zelkor::KeyValueMessage& dictionary) 
 void MetricService::processMetric(const zelkor::KeyValueMessage& dictionary) {
   const std::optional<std::int64_t> metricId = dictionary.integer(metricIDKey);
   if (!metricId) {
-    channelLog.log("Metric validator - processMetric - invalid metricId");
+    metricRelatedLog.log("Metric validator - processMetric - invalid metricId");
     return;
   }
   const std::string hexId = fmt::format("{:2X}", static_cast<std::uint64_t>(*metricId));
-  channelLog.log("MetricValidator - processMetric - metricId: %{public}d - metric dictionary: %{public}@", hexId,
-                 dictionary);
+  metricRelatedLog.log("MetricValidator - processMetric - metricId: %{public}d - metric dictionary: %{public}@", hexId,
+                       dictionary);
 
   const bool isException = contains(exceptionMetricIds, *metricId);
   for (const MetricGroupV2& row : MetricGroupV2::metricGroupData()) {
@@ -113,13 +109,13 @@ bool MetricService::processRow(std::int64_t metricId, std::string_view hexId, co
     logException(metricId);
     return true;
   }
-  serviceLog.log("MetricService - processMetric - ClassFromName %{public}s", row.className);
+  metricServiceLog.log("MetricService - processMetric - ClassFromName %{public}s", row.className);
   if (decoded->empty()) {
-    serviceLog.log("dictionary is empty  ---> %{public}s", OptionalMetricId{metricId});
+    metricServiceLog.log("dictionary is empty  ---> %{public}s", OptionalMetricId{metricId});
     return false;
   }
-  channelLog.log("marker: %{public}s, metricName: %{public}s, dictionaryCount: %{public}@", kMarker, TechAndName{row},
-                 decoded->size());
+  metricRelatedLog.log("marker: %{public}s, metricName: %{public}s, dictionaryCount: %{public}@", kMarker,
+                       TechAndName{row}, decoded->size());
 
   // Taken from what was decoded: the Ice rules drop the top level.
   const Date date = collectionDate(*decoded);

@@ -1,19 +1,16 @@
 #include "intake/ValueConversion.h"
 
 #include <algorithm>
-#include <charconv>
 #include <cstdint>
 #include <iterator>
 #include <utility>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
-#include "shell/LogCategories.h"
+#include "base/NumberText.h"
+#include "shell/Logs.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger formattingLog{log_category::kFormatting};
 
 constexpr std::string_view kBandwidthKeys[] = {"kHVCellMonitorBandwidth", "dl_bw", "ul_bw"};
 
@@ -24,14 +21,6 @@ constexpr std::pair<std::int64_t, std::string_view> kBandwidthByResourceBlocks[]
 
 void logConversion(std::string_view key, std::string_view value) {
   formattingLog.log("Preprocess - processValue -  key: %{public}s value: %{public}s", key, value);
-}
-
-/// 0 for what is empty or no whole decimal integer.
-std::int64_t decimalInteger(std::string_view text) {
-  if (text.size() > 1 && text[0] == '+' && text[1] != '-') text.remove_prefix(1);
-  std::int64_t number = 0;
-  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number);
-  return error == std::errc() && end == text.data() + text.size() ? number : 0;
 }
 
 /// Only Mav basebands report the count of resource blocks itself; all others report twice that.
@@ -50,7 +39,7 @@ std::string processValue(std::string_view key, std::string_view value) {
       std::find(std::begin(kBandwidthKeys), std::end(kBandwidthKeys), key) != std::end(kBandwidthKeys);
   if (!isBandwidth || value == "0") return std::string(value);
 
-  std::int64_t resourceBlocks = decimalInteger(value);
+  std::int64_t resourceBlocks = decimalInteger(value).value_or(0);
   if (!reportsResourceBlocks()) resourceBlocks /= 2;
   const auto* found = std::find_if(std::begin(kBandwidthByResourceBlocks), std::end(kBandwidthByResourceBlocks),
                                    [&](const auto& entry) { return entry.first == resourceBlocks; });

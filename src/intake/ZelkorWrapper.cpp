@@ -7,16 +7,13 @@
 #include <string>
 #include <utility>
 
-#include "base/Log.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 namespace quorl {
 namespace {
 
 using zelkor::KeyValueMessage;
-
-constexpr Logger channelLog{log_category::kMetricRelated};
 
 constexpr char kClientName[] = "quorl";
 constexpr std::string_view kAcceptedAppId = "quorl";
@@ -123,7 +120,7 @@ zelkor::client::Result ZelkorWrapper::performCommand(std::string_view operation,
 }
 
 bool ZelkorWrapper::addVexilConfigForAppId(std::string_view appId, const std::filesystem::path& protofFilePath) {
-  channelLog.log("[QuorlInternal-4] addVexilConfigForAppId begins");
+  metricRelatedLog.log("[QuorlInternal-4] addVexilConfigForAppId begins");
   if (appId != kAcceptedAppId) return false;
   std::optional<ByteString> content = readFile(protofFilePath);
   if (!content) return false;
@@ -134,7 +131,7 @@ bool ZelkorWrapper::addVexilConfigForAppId(std::string_view appId, const std::fi
   message.set(zelkor::kKeyPayloadType, kPayloadType);
   const zelkor::client::Result result = performCommand("-[ZelkorWrapper addVexilConfigForAppId:andProtofFilePath:]",
                                                        zelkor::kCommandAddConfiguration, message);
-  channelLog.log("[QuorlInternal-4] addVexilConfigForAppId success? %{public}s", successText(result));
+  metricRelatedLog.log("[QuorlInternal-4] addVexilConfigForAppId success? %{public}s", successText(result));
   return result.code == 0;
 }
 
@@ -145,7 +142,7 @@ bool ZelkorWrapper::removeVexilConfigForAppid(std::string_view appId) {
   message.set(zelkor::kKeyAppID, kAppIdOnTheChannel);
   const zelkor::client::Result result =
       performCommand("-[ZelkorWrapper removeVexilConfigForAppid:]", zelkor::kCommandClearConfiguration, message);
-  channelLog.log("[QuorlInternal-4] removeVexilConfigForAppid success? %{public}s", successText(result));
+  metricRelatedLog.log("[QuorlInternal-4] removeVexilConfigForAppid success? %{public}s", successText(result));
   return result.code == 0;
 }
 
@@ -164,8 +161,8 @@ bool ZelkorWrapper::querySpecificMetric(std::string_view appId, std::int32_t tri
   const zelkor::client::Result result =
       performCommand("-[ZelkorWrapper querySpecificMetric:triggerRef:triggerType:triggerID:profileID:metricID:]",
                      zelkor::kCommandQueryMetric, message);
-  channelLog.log("[QuorlInternal-4] querySpecificMetric success? %{public}s errorCode if any %{public}d",
-                 successText(result), result.code);
+  metricRelatedLog.log("[QuorlInternal-4] querySpecificMetric success? %{public}s errorCode if any %{public}d",
+                       successText(result), result.code);
   return result.code == 0;
 }
 
@@ -187,8 +184,8 @@ void ZelkorWrapper::listen() {
                                   KeyValueMessage dictionary;
                                   for (const std::string_view key : kMetricKeys)
                                     if (const zelkor::KeyValue* value = message.find(key)) dictionary.set(key, *value);
-                                  channelLog.log("received - metricId %{public}@, initialTimestamp: %{public}ld",
-                                                 MetricIdOf{dictionary}, SecondsOf{clock});
+                                  metricRelatedLog.log("received - metricId %{public}@, initialTimestamp: %{public}ld",
+                                                       MetricIdOf{dictionary}, SecondsOf{clock});
                                   if (!slot->exists()) return;
                                   mainQueue.async([slot, dictionary = std::move(dictionary)] {
                                     if (const auto delegate = slot->get()) delegate->metricsDidUpdate(dictionary);

@@ -4,6 +4,7 @@
 #include "messages/KBBMetricUtility.h"
 #include "messages/MessageFields.h"
 #include "messages/wire/WireReader.h"
+#include "messages/wire/WireType.h"
 
 namespace quorl {
 
@@ -11,15 +12,12 @@ namespace {
 
 constexpr Logger logger{"metric-related"};
 
-constexpr std::uint64_t kLengthDelimited = 2;
-constexpr std::uint64_t kEndGroup = 4;
-
 using fields::member;
 using fields::setFlag;
 
 template <typename T, typename Read>
 bool readList(WireReader& reader, ListRecord<T>& list, std::uint64_t wireType, Read read) {
-  if (wireType != kLengthDelimited) {
+  if (wireType != wire_type::kLengthDelimited) {
     list.add(read());
     return true;
   }
@@ -65,7 +63,7 @@ bool MetricCodable::readFields(WireReader& reader, const MessageTable& table) {
     if (reader.error) break;
     const std::uint64_t key = reader.readKey();
     const std::uint64_t wireType = key & 7U;
-    if (reader.error || wireType == kEndGroup) break;
+    if (reader.error || wireType == wire_type::kEndGroup) break;
     const auto tag = static_cast<std::uint32_t>(key >> 3U);
     const FieldEntry* field = table.find(tag);
     // The wire type is not compared with the field's.

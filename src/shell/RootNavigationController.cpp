@@ -4,19 +4,15 @@
 #include <utility>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
 #include "intake/MetricChannel.h"
 #include "intake/MetricService.h"
 #include "intake/ZelkorWrapper.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "store/PersistanceStore.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger appUiLog{log_category::kAppUi};
-constexpr Logger metricRelatedLog{log_category::kMetricRelated};
 
 constexpr std::chrono::seconds kFirstRefreshDelay{10};
 

@@ -7,9 +7,8 @@
 #include <sys/stat.h>
 
 #include "base/DateText.h"
-#include "base/Log.h"
 #include "base/Uuid.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "store/KeptReadings.h"
 #include "store/MetricBinding.h"
 #include "store/MetricStatements.h"
@@ -24,8 +23,6 @@ using store_detail::onMain;
 using store_detail::succeedOnMain;
 
 namespace {
-
-constexpr Logger databaseLog{log_category::kDatabase};
 
 constexpr char kFileName[] = "metricPartV11.sqlite";
 

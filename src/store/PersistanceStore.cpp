@@ -4,10 +4,9 @@
 
 #include "app/HardwareManager.h"
 #include "base/FatalStop.h"
-#include "base/Log.h"
 #include "intake/MetricService.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 #include "store/DefaultDashboard.h"
 #include "store/MetricStatements.h"
@@ -15,8 +14,6 @@
 
 namespace quorl {
 namespace {
-
-constexpr Logger databaseLog{log_category::kDatabase};
 
 // Names for the log alone; the first is not that of the table.
 constexpr char kMetricTableName[] = "MetricV20";

@@ -8,18 +8,15 @@
 #include <fmt/format.h>
 
 #include "base/FatalStop.h"
-#include "base/Log.h"
 #include "intake/MetricGroupV2.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 #include "telephony/CellDictionary.h"
 #include "telephony/TelephonyLogText.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger horvaneLog{log_category::kHorvaneService};
 
 constexpr char kTech[] = "RAT";
 constexpr char kCellInfo[] = "Cell Info";
@@ -60,7 +57,7 @@ HorvaneService::HorvaneService(Private, PersistanceStoreProtocol& store)
 
 void HorvaneService::start() {
   client_->setDelegate(weak_from_this());
-  horvaneLog.log("HorvaneService - init");
+  horvaneServiceLog.log("HorvaneService - init");
   mainQueue_.asyncAfter(kActivationDelay, [weak = weak_from_this()] {
     if (const auto self = weak.lock()) self->observeDidBecomeActive();
   });
@@ -72,7 +69,7 @@ void HorvaneService::observeDidBecomeActive() {
       notification::kDidBecomeActive, [weak = weak_from_this()](const Notification&) {
         const auto self = weak.lock();
         if (!self) return;
-        horvaneLog.log("HorvaneService - didBecomeActiveNotification");
+        horvaneServiceLog.log("HorvaneService - didBecomeActiveNotification");
         self->carrierInfoArray_.clear();
         self->getSubscriptionInfo();
       });
@@ -87,7 +84,7 @@ void HorvaneService::getSubscriptionInfo() {
 void HorvaneService::fetchCarrierSubscriptions(const std::optional<HVServiceSubscriptionInfo>& info,
                                                const std::optional<HVError>& error) {
   if (error) {
-    horvaneLog.log("HorvaneService - fetchCarrierSubscriptions error: %{public}s ", error->text);
+    horvaneServiceLog.log("HorvaneService - fetchCarrierSubscriptions error: %{public}s ", error->text);
     return;
   }
   if (!info || !info->subscriptions) return;
@@ -106,7 +103,7 @@ void HorvaneService::fetchCarrierSubscriptions(const std::optional<HVServiceSubs
 
 void HorvaneService::processCarrierInfo() {
   const auto providers = telephony_.networkInfo()->subscriberProviders();
-  horvaneLog.log("HorvaneService - processCarrierInfo");
+  horvaneServiceLog.log("HorvaneService - processCarrierInfo");
   if (!providers) return;
   for (const auto& [slotKey, carrier] : *providers)
     for (CarrierInfoObject& record : carrierInfoArray_)
@@ -132,7 +129,7 @@ void HorvaneService::select(const CarrierInfoObject* record) {
 }
 
 void HorvaneService::cellMonitorUpdate(const HVServiceSubscriptionContext& context, const HVCellInfo& info) {
-  horvaneLog.log("context  ---> %s and info ---> %s", context, info);
+  horvaneServiceLog.log("context  ---> %s and info ---> %s", context, info);
   const HVSubscriptionSlot slot = context.slotID();
   if (carrierInfoArray_.empty()) {
     carrierInfoArray_.push_back(makeRecord(context));
@@ -153,8 +150,8 @@ void HorvaneService::cellMonitorUpdate(const HVServiceSubscriptionContext& conte
 void HorvaneService::connectionStateChanged(const HVServiceSubscriptionContext& context,
                                             HVDataConnectionType connection,
                                             HVDataConnectionStatus dataConnectionStatusInfo) {
-  horvaneLog.log("context  ---> %{public}s and connection ---> %{public}s and statusinfo %{public}s", context,
-                 connection, dataConnectionStatusInfo);
+  horvaneServiceLog.log("context  ---> %{public}s and connection ---> %{public}s and statusinfo %{public}s", context,
+                        connection, dataConnectionStatusInfo);
 }
 
 void HorvaneService::copyCellInfo(HVSubscriptionSlot slot) {
@@ -164,7 +161,7 @@ void HorvaneService::copyCellInfo(HVSubscriptionSlot slot) {
                           // Off the main thread the service is never locked, so that it cannot come to its end here.
                           if (weak.expired()) return;
                           if (error) {
-                            horvaneLog.log("HorvaneService - fetchCellInfo error: %{public}s ", error->text);
+                            horvaneServiceLog.log("HorvaneService - fetchCellInfo error: %{public}s ", error->text);
                             return;
                           }
                           if (!info) return;
@@ -175,7 +172,7 @@ void HorvaneService::copyCellInfo(HVSubscriptionSlot slot) {
 }
 
 void HorvaneService::fetchCellInfo(HVSubscriptionSlot slot, HVCellInfo info) {
-  horvaneLog.log("incoming subscription slot  ---> %{public}d", slot);
+  horvaneServiceLog.log("incoming subscription slot  ---> %{public}d", slot);
   fetchSignalMeasurementsAndMerge(slot, std::move(info));
 }
 
@@ -245,7 +242,7 @@ void HorvaneService::storeBandRows(const char* metricName, const std::optional<H
 Metric HorvaneService::cellInfoDBBuilder(const char* metricTech, const char* metricName,
                                          const std::string& attributeName, const HVCellValue& attributeValue,
                                          std::int32_t subsId) const {
-  horvaneLog.log("HorvaneService - cellInfoDBBuilder");
+  horvaneServiceLog.log("HorvaneService - cellInfoDBBuilder");
   Metric row;
   row.id = Uuid::make();
   row.metricTech = metricTech;
@@ -259,7 +256,7 @@ Metric HorvaneService::cellInfoDBBuilder(const char* metricTech, const char* met
     row.attributeValueType = "INT";
     row.attributeValue = std::to_string(*number);
   } else {
-    horvaneLog.log("unknown type  ---> %{public}s", std::get<HVUnknownValue>(attributeValue).typeName);
+    horvaneServiceLog.log("unknown type  ---> %{public}s", std::get<HVUnknownValue>(attributeValue).typeName);
   }
   row.collectedOn = clock_.now();
   row.metricId = metricName;
@@ -278,7 +275,7 @@ void HorvaneService::insertTelephonyRow(const Metric& row) {
     if (success) {
       NotificationCenter::defaultCenter().post(notification::kNewHVMetric, {{notification::kMetricObjectKey, copy}});
     } else {
-      horvaneLog.error("error occurred while inserting  ---> %{public}s", text(error));
+      horvaneServiceLog.error("error occurred while inserting  ---> %{public}s", text(error));
     }
   });
 }
@@ -299,7 +296,7 @@ void HorvaneService::refreshCarrierRows(std::size_t index, const char* metricNam
       [weak = weak_from_this(), index, rows](std::vector<Metric> metrics, const std::optional<SQLiteError>& error) {
         // A failed read may complete on the database's queue, where the service is neither locked nor touched.
         if (metrics.empty()) {
-          if (!weak.expired()) horvaneLog.error("error occured  ---> %{public}s", text(error));
+          if (!weak.expired()) horvaneServiceLog.error("error occured  ---> %{public}s", text(error));
           return;
         }
         const auto self = weak.lock();

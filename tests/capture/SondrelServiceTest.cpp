@@ -51,7 +51,7 @@ LogLine line(std::string text, LogLevel level = LogLevel::Default) {
   return {"sondrel", level, std::move(text)};
 }
 
-SondrelFileInformation file(std::string name) {
+SondrelFileInformation chunk(std::string name) {
   return {std::move(name), "32 KB", Date(std::chrono::seconds(1767605412))};
 }
 
@@ -195,14 +195,14 @@ TEST_F(SondrelServiceTest, AnyOtherStateIsUnexpected) {
 
 TEST_F(SondrelServiceTest, FilesGoToTheScreen) {
   launch();
-  service->didCollectLogs({{file("a"), file("b")}}, std::nullopt);
+  service->didCollectLogs({{chunk("a"), chunk("b")}}, std::nullopt);
   ASSERT_THAT(screen->batches, SizeIs(1));
-  EXPECT_THAT(screen->batches[0], ElementsAre(file("a"), file("b")));
+  EXPECT_THAT(screen->batches[0], ElementsAre(chunk("a"), chunk("b")));
 }
 
 TEST_F(SondrelServiceTest, ABatchThatComesWithAnErrorIsDeliveredAndTheErrorDropped) {
   launch();
-  service->didCollectLogs({{file("a")}}, error);
+  service->didCollectLogs({{chunk("a")}}, error);
   EXPECT_THAT(screen->batches, SizeIs(1));
   EXPECT_THAT(screen->alerts, IsEmpty());
   EXPECT_THAT(log.lines(), IsEmpty());
@@ -216,10 +216,10 @@ TEST_F(SondrelServiceTest, AnEmptyBatchIsDelivered) {
 
 TEST_F(SondrelServiceTest, ABatchWithOneForeignElementCountsAsNone) {
   launch();
-  service->didCollectLogs({{file("a"), SondrelUnknownObject()}}, std::nullopt);
-  service->didCollectLogs({{std::string("a"), file("b")}}, std::nullopt);
+  service->didCollectLogs({{chunk("a"), SondrelUnknownObject()}}, std::nullopt);
+  service->didCollectLogs({{std::string("a"), chunk("b")}}, std::nullopt);
   EXPECT_THAT(screen->events, IsEmpty());
-  service->didCollectLogs({{file("a"), SondrelUnknownObject()}}, error);
+  service->didCollectLogs({{chunk("a"), SondrelUnknownObject()}}, error);
   EXPECT_THAT(screen->events, IsEmpty());
   EXPECT_THAT(screen->alerts, SizeIs(1));
 }
@@ -266,7 +266,7 @@ TEST_F(SondrelServiceTest, AnEmptyListOfConfigurationsIsOfferedToo) {
 TEST_F(SondrelServiceTest, AListThatIsNoListOfTextsIsNothing) {
   launch();
   service->configurationListAvailable(std::nullopt);
-  service->configurationListAvailable({{std::string("Default"), file("a")}});
+  service->configurationListAvailable({{std::string("Default"), chunk("a")}});
   EXPECT_THAT(screen->events, IsEmpty());
   EXPECT_THAT(log.lines(), IsEmpty());
 }

@@ -10,7 +10,6 @@ namespace quorl::test {
 namespace {
 
 constexpr std::int64_t kCaStatus = 0x3CD313;
-constexpr std::int64_t kActiveBearers = 0x3CD50D;
 constexpr std::int64_t kUmtsServingCell = 0x3CD102;
 constexpr std::int64_t kUmtsNeighborCells = 0x3CD105;
 

@@ -21,6 +21,8 @@
 
 namespace quorl::test {
 
+inline constexpr std::int64_t kActiveBearers = 0x3CD50D;
+
 /// A store that keeps what it is given and completes when a test says so.
 class RecordingStore final : public RowsOnlyStore {
  public:

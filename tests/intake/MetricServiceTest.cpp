@@ -18,7 +18,6 @@ using zelkor::KeyValueMessage;
 
 constexpr std::int64_t kNrRrcState = 806917;
 constexpr std::int64_t kNrRadioLinkFailure = 806931;
-constexpr std::int64_t kActiveBearers = 3986701;
 
 using MetricServiceTest = IntakeTest;
 

@@ -23,7 +23,7 @@ using google::protobuf::Message;
 using google::protobuf::UnknownFieldSet;
 using google::protobuf::util::MessageDifferencer;
 
-constexpr int kMessages = 200;
+constexpr int kRounds = 200;
 
 class ConformanceTest : public testing::TestWithParam<const MessageTable*> {
  protected:
@@ -62,7 +62,7 @@ class ConformanceTest : public testing::TestWithParam<const MessageTable*> {
 };
 
 TEST_P(ConformanceTest, WhatLibprotobufWritesHasTheSameContentHere) {
-  for (int round = 0; round < kMessages; ++round) {
+  for (int round = 0; round < kRounds; ++round) {
     const auto message = protobufMessage();
     fill(*message, round);
     const auto decoded = decode(message->SerializeAsString());
@@ -71,7 +71,7 @@ TEST_P(ConformanceTest, WhatLibprotobufWritesHasTheSameContentHere) {
 }
 
 TEST_P(ConformanceTest, WhatIsWrittenHereHasTheSameContentThere) {
-  for (int round = 0; round < kMessages; ++round) {
+  for (int round = 0; round < kRounds; ++round) {
     const auto message = protobufMessage();
     fill(*message, round);
     const auto decoded = decode(message->SerializeAsString());
@@ -83,7 +83,7 @@ TEST_P(ConformanceTest, WhatIsWrittenHereHasTheSameContentThere) {
 
 TEST_P(ConformanceTest, ListsInTheOtherFormAndEnumerationsWithAnyNumberReadTheSame) {
   const auto named = protobufMessage();
-  for (int round = 0; round < kMessages; ++round) {
+  for (int round = 0; round < kRounds; ++round) {
     const auto message = test::OtherSender::shared().newMessage(table().className);
     fill(*message, round);
     const auto decoded = decode(message->SerializeAsString());
@@ -95,7 +95,7 @@ TEST_P(ConformanceTest, ListsInTheOtherFormAndEnumerationsWithAnyNumberReadTheSa
 }
 
 TEST_P(ConformanceTest, UnknownFieldsOfEveryWireTypeAreLeftOut) {
-  for (int round = 0; round < kMessages / 4; ++round) {
+  for (int round = 0; round < kRounds / 4; ++round) {
     const auto message = protobufMessage();
     fill(*message, round);
     const std::string known = message->SerializeAsString();
@@ -128,7 +128,7 @@ TEST_P(ConformanceTest, TruncatedPayloadsAreRefusedWhereLibprotobufRefusesThem) 
 }
 
 TEST_P(ConformanceTest, MergingFoldsLikeLibprotobuf) {
-  for (int round = 0; round < kMessages / 4; ++round) {
+  for (int round = 0; round < kRounds / 4; ++round) {
     const auto first = protobufMessage();
     const auto second = protobufMessage();
     fill(*first, round);

@@ -15,7 +15,7 @@ using ::testing::IsEmpty;
 using ::testing::Not;
 using namespace std::chrono_literals;
 
-struct Screen final : AllMetricsViewModelDelegate {
+struct ListScreen final : AllMetricsViewModelDelegate {
   void reloadMetricsList() override { ++reloads; }
   int reloads = 0;
 };
@@ -48,7 +48,7 @@ class AllMetricsTest : public test::ScreenTest {
     return answer;
   }
 
-  std::shared_ptr<Screen> screen = std::make_shared<Screen>();
+  std::shared_ptr<ListScreen> screen = std::make_shared<ListScreen>();
   std::shared_ptr<AllMetricsViewModel> model;
 };
 

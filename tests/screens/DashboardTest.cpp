@@ -20,7 +20,7 @@ using ::testing::Pair;
 using ::testing::UnorderedElementsAre;
 using namespace std::chrono_literals;
 
-struct Screen final : DashboardViewModelDelegate {
+struct DashboardScreen final : DashboardViewModelDelegate {
   void updateLastRefreshed(const std::string& text) override { refreshed.push_back(text); }
   std::vector<std::string> refreshed;
 };
@@ -57,7 +57,7 @@ class DashboardTest : public test::ScreenTest {
     settle();
   }
 
-  std::shared_ptr<Screen> screen = std::make_shared<Screen>();
+  std::shared_ptr<DashboardScreen> screen = std::make_shared<DashboardScreen>();
   std::shared_ptr<DashboardViewModel> model;
 };
 

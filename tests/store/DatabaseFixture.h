@@ -21,6 +21,10 @@
 
 namespace quorl::test {
 
+inline constexpr auto kDaily = AttributeDetailTimeFrame::daily;
+inline constexpr auto kWeekly = AttributeDetailTimeFrame::weekly;
+inline constexpr auto kMonthly = AttributeDetailTimeFrame::monthly;
+
 /// On which queue a completion ran.
 enum class Place { none, main, database };
 

@@ -8,6 +8,9 @@ namespace quorl {
 namespace {
 
 using test::emptyQueryResult;
+using test::kDaily;
+using test::kMonthly;
+using test::kWeekly;
 using test::Listed;
 using test::Pinned;
 using test::Place;
@@ -16,10 +19,6 @@ using test::Read;
 using test::Row;
 using test::times;
 using test::values;
-
-constexpr auto kDaily = AttributeDetailTimeFrame::daily;
-constexpr auto kWeekly = AttributeDetailTimeFrame::weekly;
-constexpr auto kMonthly = AttributeDetailTimeFrame::monthly;
 
 class StoreReadsTest : public test::DatabaseFixture {
  protected:

@@ -6,13 +6,12 @@
 namespace quorl {
 namespace {
 
+using test::kDaily;
+using test::kMonthly;
+using test::kWeekly;
 using test::Row;
 using test::times;
 using test::values;
-
-constexpr auto kDaily = AttributeDetailTimeFrame::daily;
-constexpr auto kWeekly = AttributeDetailTimeFrame::weekly;
-constexpr auto kMonthly = AttributeDetailTimeFrame::monthly;
 
 struct Moment {
   const char* name;

@@ -17,7 +17,6 @@ namespace client = zelkor::client;
 
 namespace {
 
-constexpr std::int64_t kApplicationId = 2;
 constexpr std::int64_t kProtofPayload = 0;
 constexpr std::int64_t kAllMetrics = 0;
 
@@ -79,7 +78,7 @@ std::optional<client::Result> messageFault(std::string_view command, const zelko
   }
   if (fault) return fault;
 
-  if (const auto appId = message.integer(zelkor::kKeyAppID); appId != kApplicationId)
+  if (const auto appId = message.integer(zelkor::kKeyAppID); appId != Configuration::kApplicationId)
     return answer(CommandCode::UnknownApplication, fmt::format("there is no application {}", *appId));
   if (const auto type = message.integer(zelkor::kKeyPayloadType); type && type != kProtofPayload)
     return answer(CommandCode::UnknownPayloadType, fmt::format("there is no payload type {}", *type));

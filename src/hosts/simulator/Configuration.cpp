@@ -9,13 +9,14 @@
 #include <fmt/format.h>
 #include <nlohmann/json.hpp>
 
+#include "hosts/simulator/JsonNumber.h"
+
 namespace quorl::simulator {
 namespace {
 
 using Json = nlohmann::json;
 using Fault = std::optional<CommandFault>;
 
-constexpr std::int64_t kApplicationId = 2;
 constexpr std::int64_t kPayloadType = 0;
 
 constexpr const char* kKeys[] = {"applicationId", "payloadType", "profileId", "triggers", "metrics"};
@@ -40,12 +41,6 @@ Fault keysFault(const Json& object, const char* const (&keys)[N], std::string_vi
     if (!isKnown) return keyFault(fmt::format("{}there is no key \"{}\"", where, key));
   }
   return std::nullopt;
-}
-
-std::optional<std::int64_t> integer(const Json& value) {
-  if (value.is_number_unsigned() && value.get<std::uint64_t>() > std::numeric_limits<std::int64_t>::max())
-    return std::nullopt;
-  return value.is_number_integer() ? std::optional(value.get<std::int64_t>()) : std::nullopt;
 }
 
 Fault readInteger(const Json& object, const char* key, std::string_view where, std::int64_t& result) {
@@ -93,7 +88,7 @@ Fault readMetrics(const Json& list, std::vector<std::int64_t>& metrics) {
 
 Fault readAll(const Json& object, Configuration& configuration) {
   if (auto fault = keysFault(object, kKeys, "")) return fault;
-  if (auto fault = readFixed(object, "applicationId", kApplicationId)) return fault;
+  if (auto fault = readFixed(object, "applicationId", Configuration::kApplicationId)) return fault;
   if (auto fault = readFixed(object, "payloadType", kPayloadType)) return fault;
   if (auto fault = readInteger(object, "profileId", "", configuration.profileId)) return fault;
   if (auto fault = readTriggers(object["triggers"], configuration.triggers)) return fault;

@@ -13,6 +13,8 @@ namespace quorl::simulator {
 /// What an application wants from the simulated baseband manager: which metrics, and by which triggers it asks for
 /// them. The form of the file is told in docs/recording-format.md.
 struct Configuration {
+  static constexpr std::int64_t kApplicationId = 2;  // the one this phone runs
+
   struct Trigger {
     std::int64_t id = 0;
     std::int64_t type = 0;

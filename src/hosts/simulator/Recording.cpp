@@ -10,25 +10,17 @@
 #include <nlohmann/json.hpp>
 
 #include "hosts/simulator/Base64.h"
+#include "hosts/simulator/JsonNumber.h"
 #include "platform/ZelkorClient.h"
 
 namespace quorl::simulator {
 namespace {
 
-using Json = nlohmann::ordered_json;
+using OrderedJson = nlohmann::ordered_json;
 
 constexpr std::string_view kAtMs = "atMs";
 
-std::optional<std::int64_t> signedNumber(const Json& value) {
-  if (value.is_number_unsigned()) {
-    const auto number = value.get<std::uint64_t>();
-    if (number > static_cast<std::uint64_t>(std::numeric_limits<std::int64_t>::max())) return std::nullopt;
-    return static_cast<std::int64_t>(number);
-  }
-  return value.is_number_integer() ? std::optional(value.get<std::int64_t>()) : std::nullopt;
-}
-
-std::optional<ByteString> payloadBytes(const Json& value) {
+std::optional<ByteString> payloadBytes(const OrderedJson& value) {
   if (!value.is_string()) return std::nullopt;
   const auto bytes = base64Bytes(value.get_ref<const std::string&>());
   return bytes ? std::optional(ByteString(*bytes)) : std::nullopt;
@@ -43,9 +35,9 @@ std::optional<std::int64_t>* integerSlot(RecordedEvent& event, std::string_view 
 }
 
 /// Takes one entry into the event. The answer says what is wrong with it, if anything is.
-std::optional<std::string> take(RecordedEvent& event, const std::string& key, const Json& value) {
+std::optional<std::string> take(RecordedEvent& event, const std::string& key, const OrderedJson& value) {
   if (std::optional<std::int64_t>* slot = integerSlot(event, key)) {
-    *slot = signedNumber(value);
+    *slot = integer(value);
     if (!*slot) return fmt::format("{} is no integer of 64 bits", key);
   } else if (key == zelkor::kKeyPayload) {
     event.payload = payloadBytes(value);
@@ -76,7 +68,7 @@ zelkor::KeyValueMessage RecordedEvent::message() const {
 }
 
 tl::expected<RecordedEvent, std::string> parseRecordingLine(std::string_view line) {
-  const Json object = Json::parse(line.begin(), line.end(), nullptr, /*allow_exceptions=*/false);
+  const OrderedJson object = OrderedJson::parse(line.begin(), line.end(), nullptr, /*allow_exceptions=*/false);
   if (object.is_discarded()) return tl::unexpected(std::string("not JSON"));
   if (!object.is_object()) return tl::unexpected(std::string("no JSON object"));
   RecordedEvent event;
@@ -86,7 +78,7 @@ tl::expected<RecordedEvent, std::string> parseRecordingLine(std::string_view lin
 }
 
 std::string recordingLine(const RecordedEvent& event) {
-  Json object = Json::object();
+  OrderedJson object = OrderedJson::object();
   const auto put = [&object](std::string_view key, const auto& value) {
     if (value) object[std::string(key)] = *value;
   };

@@ -13,10 +13,12 @@
 #include <fmt/format.h>
 #include <nlohmann/json.hpp>
 
+#include "hosts/simulator/JsonNumber.h"
+
 namespace quorl::simulator {
 namespace {
 
-using Json = nlohmann::ordered_json;  // cell dictionaries keep their order
+using OrderedJson = nlohmann::ordered_json;  // cell dictionaries keep their order
 namespace event = telephony_event;
 
 constexpr std::int64_t kLongestMs = std::int64_t{30} * 24 * 60 * 60 * 1000;
@@ -30,33 +32,23 @@ template <typename... Args>
   throw BadLine{fmt::format(format, std::forward<Args>(args)...)};
 }
 
-std::optional<std::int64_t> integer(const Json& value) {
-  if (value.is_number_unsigned()) {
-    const auto number = value.get<std::uint64_t>();
-    if (number > static_cast<std::uint64_t>(std::numeric_limits<std::int64_t>::max())) return std::nullopt;
-    return static_cast<std::int64_t>(number);
-  }
-  if (value.is_number_integer()) return value.get<std::int64_t>();
-  return std::nullopt;
-}
-
 template <typename Enum>
 using Names = std::initializer_list<std::pair<std::string_view, Enum>>;
 
 /// The fields of one line. Each is asked for once; what nobody asked for is a mistake of the writer.
 class Fields {
  public:
-  explicit Fields(const Json& line) : line_(line) {}
+  explicit Fields(const OrderedJson& line) : line_(line) {}
 
   /// Null for a field that is left out.
-  const Json* find(const char* name) {
+  const OrderedJson* find(const char* name) {
     asked_.emplace_back(name);
     const auto found = line_.find(name);
     return found == line_.end() ? nullptr : &*found;
   }
 
-  const Json& need(const char* name) {
-    const Json* value = find(name);
+  const OrderedJson& need(const char* name) {
+    const OrderedJson* value = find(name);
     if (value == nullptr) bad("{} is missing", name);
     return *value;
   }
@@ -68,13 +60,13 @@ class Fields {
   }
 
   std::string text(const char* name) {
-    const Json& value = need(name);
+    const OrderedJson& value = need(name);
     if (!value.is_string()) bad("{} must be a text", name);
     return value.get<std::string>();
   }
 
   bool boolean(const char* name) {
-    const Json& value = need(name);
+    const OrderedJson& value = need(name);
     if (!value.is_boolean()) bad("{} must be true or false", name);
     return value.get<bool>();
   }
@@ -99,11 +91,11 @@ class Fields {
   }
 
  private:
-  const Json& line_;
+  const OrderedJson& line_;
   std::vector<std::string> asked_;
 };
 
-HVCellValue cellValue(const std::string& key, const Json& value) {
+HVCellValue cellValue(const std::string& key, const OrderedJson& value) {
   if (value.is_string()) return value.get<std::string>();
   if (value.is_number_integer()) {
     const auto number = integer(value);
@@ -113,7 +105,7 @@ HVCellValue cellValue(const std::string& key, const Json& value) {
   return HVUnknownValue{value.type_name()};
 }
 
-HVCellInfo cellInfo(const Json& value) {
+HVCellInfo cellInfo(const OrderedJson& value) {
   HVCellInfo info;
   if (value.is_null()) return info;
   if (!value.is_object()) bad("info must be an object or null");
@@ -123,14 +115,14 @@ HVCellInfo cellInfo(const Json& value) {
   return info;
 }
 
-std::optional<HVBandDictionary> bands(const char* name, const Json* value) {
+std::optional<HVBandDictionary> bands(const char* name, const OrderedJson* value) {
   if (value == nullptr || value->is_null()) return std::nullopt;
   if (!value->is_object()) bad("{} must be an object or null", name);
   HVBandDictionary result;
   for (const auto& [technology, list] : value->items()) {
     if (!list.is_array()) bad("{} of \"{}\" must be a list", name, technology);
     std::vector<std::int64_t> numbers;
-    for (const Json& entry : list) {
+    for (const OrderedJson& entry : list) {
       const auto number = integer(entry);
       if (!number) bad("{} of \"{}\" must hold whole numbers", name, technology);
       numbers.push_back(*number);
@@ -140,7 +132,7 @@ std::optional<HVBandDictionary> bands(const char* name, const Json* value) {
   return result;
 }
 
-std::optional<std::string> optionalText(const char* name, const Json* value) {
+std::optional<std::string> optionalText(const char* name, const OrderedJson* value) {
   if (value == nullptr || value->is_null()) return std::nullopt;
   if (!value->is_string()) bad("{} must be a text or null", name);
   return value->get<std::string>();
@@ -217,7 +209,7 @@ event::Event connection(Fields& fields) {
 using EventReader = event::Event (*)(Fields&);
 
 TelephonyScriptStep readLine(const std::string& line) {
-  const Json json = Json::parse(line, nullptr, /*allow_exceptions=*/false);
+  const OrderedJson json = OrderedJson::parse(line, nullptr, /*allow_exceptions=*/false);
   if (json.is_discarded()) bad("no JSON");
   if (!json.is_object()) bad("no JSON object");
   Fields fields(json);

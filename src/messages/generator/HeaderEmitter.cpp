@@ -1,7 +1,6 @@
 #include "messages/generator/HeaderEmitter.h"
 
 #include <algorithm>
-#include <iterator>
 #include <set>
 #include <sstream>
 #include <vector>
@@ -9,6 +8,7 @@
 #include <fmt/format.h>
 
 #include "messages/generator/Fields.h"
+#include "messages/generator/Output.h"
 
 namespace quorl::generator {
 
@@ -16,13 +16,6 @@ using google::protobuf::EnumDescriptor;
 using google::protobuf::FileDescriptor;
 
 namespace {
-
-using Output = fmt::memory_buffer;
-
-template <typename... Args>
-void emit(Output& out, fmt::format_string<Args...> format, Args&&... args) {
-  fmt::format_to(std::back_inserter(out), format, std::forward<Args>(args)...);
-}
 
 /// The schema's comment, line by line.
 void emitComment(Output& out, std::string_view indent, std::string_view mark, const std::string& text) {

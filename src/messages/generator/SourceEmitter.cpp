@@ -1,7 +1,6 @@
 #include "messages/generator/SourceEmitter.h"
 
 #include <algorithm>
-#include <iterator>
 #include <set>
 #include <stdexcept>
 
@@ -9,6 +8,7 @@
 
 #include "messages/generator/Fields.h"
 #include "messages/generator/HeaderEmitter.h"
+#include "messages/generator/Output.h"
 #include "quorl_options.pb.h"
 
 namespace quorl::generator {
@@ -18,13 +18,6 @@ using google::protobuf::EnumValueDescriptor;
 using google::protobuf::FileDescriptor;
 
 namespace {
-
-using Output = fmt::memory_buffer;
-
-template <typename... Args>
-void emit(Output& out, fmt::format_string<Args...> format, Args&&... args) {
-  fmt::format_to(std::back_inserter(out), format, std::forward<Args>(args)...);
-}
 
 void emitEnumTable(Output& out, const EnumDescriptor& enumeration) {
   const std::string name = enumTableName(enumeration);

@@ -4,6 +4,8 @@
 
 #include <unicode/utf8.h>
 
+#include "messages/wire/WireType.h"
+
 namespace quorl {
 
 namespace {
@@ -81,16 +83,16 @@ bool WireReader::skipBytes(std::uint64_t count) {
 bool WireReader::skipValue(std::uint32_t tag, std::uint32_t wireType) {
   std::uint64_t size = 0;
   switch (wireType) {
-    case 0:
+    case wire_type::kVarint:
       readVarint();
       return !error;
-    case 1:
+    case wire_type::kFixed64:
       return skipBytes(8);
-    case 2:
+    case wire_type::kLengthDelimited:
       return readLength(size) && skipBytes(size);
-    case 3:
+    case wire_type::kStartGroup:
       return skipGroup(tag, 1);
-    case 5:
+    case wire_type::kFixed32:
       return skipBytes(4);
     default:
       return false;
@@ -104,8 +106,9 @@ bool WireReader::skipGroup(std::uint32_t tag, int depth) {
     if (error) return false;
     const auto innerTag = static_cast<std::uint32_t>(key >> 3U);
     const auto wireType = static_cast<std::uint32_t>(key & 7U);
-    if (wireType == 4) return innerTag == tag;
-    if (wireType == 3 ? !skipGroup(innerTag, depth + 1) : !skipValue(innerTag, wireType)) return false;
+    if (wireType == wire_type::kEndGroup) return innerTag == tag;
+    if (wireType == wire_type::kStartGroup ? !skipGroup(innerTag, depth + 1) : !skipValue(innerTag, wireType))
+      return false;
   }
   return false;
 }

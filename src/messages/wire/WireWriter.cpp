@@ -1,10 +1,10 @@
 #include "messages/wire/WireWriter.h"
 
+#include "messages/wire/WireType.h"
+
 namespace quorl {
 
 namespace {
-constexpr std::uint32_t kVarint = 0;
-constexpr std::uint32_t kLengthDelimited = 2;
 
 std::string_view encodeVarint(std::uint64_t value, char (&buffer)[10]) {
   std::size_t size = 0;
@@ -28,7 +28,7 @@ void WireWriter::writeUInt32(std::uint32_t value, std::uint32_t tag) {
 }
 
 void WireWriter::writeUInt64(std::uint64_t value, std::uint32_t tag) {
-  key(tag, kVarint);
+  key(tag, wire_type::kVarint);
   varint(value);
 }
 
@@ -46,13 +46,13 @@ void WireWriter::writeBool(bool value, std::uint32_t tag) {
 }
 
 void WireWriter::writeBytes(std::string_view value, std::uint32_t tag) {
-  key(tag, kLengthDelimited);
+  key(tag, wire_type::kLengthDelimited);
   varint(value.size());
   bytes_ += value;
 }
 
 WireWriter::Mark WireWriter::placeMark(std::uint32_t tag) {
-  key(tag, kLengthDelimited);
+  key(tag, wire_type::kLengthDelimited);
   return bytes_.size();
 }
 

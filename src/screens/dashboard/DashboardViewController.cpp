@@ -4,15 +4,12 @@
 #include <utility>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
 #include "intake/ValueConversion.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger generalLog{log_category::kGeneral};
 
 constexpr char kLastRefreshed[] = "Last refreshed: ";
 

@@ -5,17 +5,14 @@
 #include <utility>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
 #include "platform/Platform.h"
 #include "screens/metricdetail/MetricSections.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 #include "shell/TimeTexts.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger dashboardLog{log_category::kDashboard};
 
 constexpr std::chrono::seconds kRefreshInterval{15};
 /// A dashboard with a single reading counts as empty.

@@ -3,19 +3,12 @@
 #include <algorithm>
 #include <utility>
 
-#include "base/Log.h"
 #include "base/NotificationCenter.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 
 namespace quorl {
-namespace {
-
-constexpr Logger generalLog{log_category::kGeneral};
-
-}  // namespace
-
 std::shared_ptr<ManageDashboardViewController> ManageDashboardViewController::make(
     std::shared_ptr<PersistanceStore> store, std::vector<DashboardTableItem> dashboardList) {
   return std::shared_ptr<ManageDashboardViewController>(

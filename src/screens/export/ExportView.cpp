@@ -5,16 +5,13 @@
 
 #include "base/DateText.h"
 #include "base/FatalStop.h"
-#include "base/Log.h"
 #include "platform/Platform.h"
 #include "screens/export/ExportText.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "store/PersistanceStore.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger generalLog{log_category::kGeneral};
 
 const char* labelOf(AttributeDetailTimeFrame timeFrame) {
   switch (timeFrame) {

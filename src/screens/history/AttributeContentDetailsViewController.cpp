@@ -4,17 +4,10 @@
 #include <utility>
 
 #include "base/FatalStop.h"
-#include "base/Log.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 namespace quorl {
-namespace {
-
-constexpr Logger generalLog{log_category::kGeneral};
-
-}  // namespace
-
 std::shared_ptr<AttributeContentDetailsViewController> AttributeContentDetailsViewController::make(
     std::shared_ptr<PersistanceStore> store, Metric metric) {
   return std::shared_ptr<AttributeContentDetailsViewController>(

@@ -1,16 +1,9 @@
 #include "screens/metricdetail/MetricDetailViewDelegate.h"
 
-#include "base/Log.h"
 #include "screens/metricdetail/MetricDetailViewModel.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 namespace quorl {
-namespace {
-
-constexpr Logger appUiLog{log_category::kAppUi};
-
-}  // namespace
-
 void MetricDetailViewDelegate::showGraphForItemAt(const MetricDetailViewModel& model, std::size_t index,
                                                   std::size_t sectionIndex, bool isSectioned) {
   const Metric* metric = model.row(index, sectionIndex, isSectioned);

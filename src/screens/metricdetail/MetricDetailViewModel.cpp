@@ -6,17 +6,15 @@
 #include <set>
 #include <utility>
 
-#include "base/Log.h"
 #include "base/NotificationCenter.h"
+#include "intake/AttributeKeys.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 #include "store/MetricStatements.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger metricDetailLog{log_category::kMetricDetail};
 
 constexpr std::chrono::seconds kLongestSpinner{30};
 constexpr int kCalendarDaysToLastSeen = 30;
@@ -132,7 +130,7 @@ void MetricDetailViewModel::apply(std::vector<Metric> rows) {
   changed_();
   applyLastSeen();
   if (!metrics_.empty()) applySectionRules();
-  std::erase_if(metrics_, [](const Metric& row) { return row.attributeNameNonLocalized == "timestamp"; });
+  std::erase_if(metrics_, [](const Metric& row) { return row.attributeNameNonLocalized == kTimestampKey; });
   std::stable_sort(metrics_.begin(), metrics_.end(),
                    [](const Metric& a, const Metric& b) { return a.attributeName < b.attributeName; });
   changed_();

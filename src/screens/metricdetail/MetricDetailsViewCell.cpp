@@ -3,18 +3,11 @@
 #include <utility>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
 #include "intake/ValueConversion.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 namespace quorl {
-namespace {
-
-constexpr Logger appUiLog{log_category::kAppUi};
-
-}  // namespace
-
 MetricDetailsViewCell::MetricDetailsViewCell(Metric metricObject, bool isBookmarked, Actions actions)
     : metricObject_(std::move(metricObject)), actions_(std::move(actions)), isBookmarked_(isBookmarked) {}
 

@@ -3,16 +3,9 @@
 #include <optional>
 #include <utility>
 
-#include "base/Log.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 
 namespace quorl {
-namespace {
-
-constexpr Logger appUiLog{log_category::kAppUi};
-
-}  // namespace
-
 std::shared_ptr<MetricDetailsViewController> MetricDetailsViewController::make(std::shared_ptr<PersistanceStore> store,
                                                                                std::string metricTech,
                                                                                std::string metricName,

@@ -4,17 +4,14 @@
 #include <utility>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
 #include "intake/MetricChannel.h"
 #include "intake/MetricService.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/TimeTexts.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger allMetricsLog{log_category::kAllMetrics};
 
 constexpr std::chrono::seconds kRefreshDuration{1};
 

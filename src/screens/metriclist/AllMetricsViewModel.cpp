@@ -4,15 +4,12 @@
 #include <utility>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
 #include "platform/Platform.h"
-#include "shell/LogCategories.h"
+#include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 
 namespace quorl {
 namespace {
-
-constexpr Logger allMetricsLog{log_category::kAllMetrics};
 
 constexpr char kTelephonyTech[] = "RAT";
 

@@ -253,7 +253,7 @@ Payload pageFailure(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
+constexpr MetricKind kCircuitSwitchedMetrics[] = {
     {790530, on<event::CdmaScanned>(), cdmaCell},
     {798732, on<event::ServingCellChanged, event::Measured>(), gsmWcdmaCell, /*isCurrent=*/true, {30000, 10000}},
     {802306, on<event::RrcChanged>(), wcdmaState},
@@ -264,7 +264,7 @@ constexpr MetricKind kKinds[] = {
 }  // namespace
 
 std::span<const MetricKind> circuitSwitchedKinds() {
-  return kKinds;
+  return kCircuitSwitchedMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

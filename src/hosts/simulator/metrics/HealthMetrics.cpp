@@ -205,7 +205,7 @@ Payload tuner(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
+constexpr MetricKind kHealthMetrics[] = {
     {827656, on<event::LinkQualityChanged>(), linkQuality},
     {827683, on<event::DataStall>(), dataStall},
     {816135, on<event::HealthFinding>(), health},
@@ -215,7 +215,7 @@ constexpr MetricKind kKinds[] = {
 }  // namespace
 
 std::span<const MetricKind> healthKinds() {
-  return kKinds;
+  return kHealthMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

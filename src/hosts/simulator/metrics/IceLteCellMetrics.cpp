@@ -19,10 +19,7 @@ using network::Technology;
 
 namespace {
 
-constexpr std::size_t kMostNeighbours = 8;
-constexpr std::int32_t kMostPower = 23;  // dBm, power class 3
-
-Payload servingCell(const Moment& moment) {
+Payload iceServingCell(const Moment& moment) {
   const ServingMeasurement* serving = lteServing(moment.state);
   if (serving == nullptr) return std::nullopt;
   const Cell& cell = *serving->best.cell;
@@ -73,7 +70,7 @@ MessageRef<NbrEutra> neighbourFrequency(const SubscriptionState& state, const Ce
   frequency->setQRxlevMin(parameters.qRxLevMin);
   frequency->setQQualMin(parameters.qQualMin);
   frequency->setQOffset(0);
-  frequency->setPmax(kMostPower);
+  frequency->setPmax(kMostLtePower);
   frequency->setDlBw(resourceBlocks(cell) * 2);
   frequency->setThresXHighP(u32(parameters.higherThreshold));
   frequency->setThresXLowP(u32(parameters.lowerThreshold));
@@ -114,7 +111,7 @@ MessageRef<GeraReselectionInfo> gsmReselection(const SubscriptionState& state) {
   return info;
 }
 
-Payload reselection(const Moment& moment) {
+Payload lteReselection(const Moment& moment) {
   const SubscriptionState& state = moment.state;
   const ServingMeasurement* serving = lteServing(state);
   if (serving == nullptr) return std::nullopt;
@@ -179,7 +176,7 @@ Payload otherTechnologies(const Moment& moment) {
   return payload(message);
 }
 
-Payload neighbours(const Moment& moment) {
+Payload lteNeighbours(const Moment& moment) {
   const SubscriptionState& state = moment.state;
   if (lteServing(state) == nullptr || state.neighbours.empty()) return std::nullopt;
   KCellularLteNbrEutraCellMeas message;
@@ -198,22 +195,22 @@ Payload neighbours(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
+constexpr MetricKind kIceLteCellMetrics[] = {
     {3948738,
      on<event::ServingCellChanged, event::Measured>(),
-     servingCell,
+     iceServingCell,
      /*isCurrent=*/true,
      {30000, 5000}},
     {3986177, on<event::Measured>(), measurement, /*isCurrent=*/true, {5000, 200}},
-    {3986190, on<event::ServingCellChanged>(), reselection, /*isCurrent=*/true},
+    {3986190, on<event::ServingCellChanged>(), lteReselection, /*isCurrent=*/true},
     {3986192, on<event::Measured>(), otherTechnologies, /*isCurrent=*/true, {20000, 1000}},
-    {3986191, on<event::Measured>(), neighbours, /*isCurrent=*/true, {10000, 400}},
+    {3986191, on<event::Measured>(), lteNeighbours, /*isCurrent=*/true, {10000, 400}},
 };
 
 }  // namespace
 
 std::span<const MetricKind> iceLteCellKinds() {
-  return kKinds;
+  return kIceLteCellMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

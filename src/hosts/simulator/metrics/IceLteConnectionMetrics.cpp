@@ -21,7 +21,7 @@ using network::Technology;
 
 namespace {
 
-std::int32_t stateNumber(RrcState state) {
+std::int32_t lteStateNumber(RrcState state) {
   switch (state) {
     case RrcState::Idle:
       return KLTE_RRC_STATE_IDLE;
@@ -83,18 +83,18 @@ std::int32_t causeNumber(RrcCause cause) {
   return State::KLTE_RRC_CAUSE_NA;
 }
 
-Payload rrcState(const Moment& moment) {
+Payload lteRrcState(const Moment& moment) {
   KCellularLteRrcState message;
   setCommon(message, moment);
   if (const auto* changed = moment.get<event::RrcChanged>()) {
     if (changed->technology != Technology::Lte) return std::nullopt;
-    message.setState(stateNumber(changed->state));
-    message.setPrevState(stateNumber(changed->previous));
+    message.setState(lteStateNumber(changed->state));
+    message.setPrevState(lteStateNumber(changed->previous));
     message.setPrevStateDurMs(u32(changed->previousMs));
     message.setCause(causeNumber(changed->cause));
   } else {
     if (lteServing(moment.state) == nullptr) return std::nullopt;
-    message.setState(stateNumber(moment.state.rrc));
+    message.setState(lteStateNumber(moment.state.rrc));
     message.setCause(causeNumber(moment.state.rrcCause));
   }
   return payload(message);
@@ -193,7 +193,7 @@ Payload connectedDrx(const Moment& moment) {
   message.setLongDrxCycleMs(drx.longCycleMs);
   message.setShortDrxCycleMs(drx.shortCycleMs);
   message.setDrxShortCycleNum(drx.shortCycles);
-  message.setRrcState(stateNumber(state.rrc));
+  message.setRrcState(lteStateNumber(state.rrc));
   message.setCdrxConfigStatus(drx.isConnectedDrx ? 1 : 0);
   message.setTransmissionMode(serving->rank > 1 ? 3 : 2);
   return payload(message);
@@ -226,8 +226,8 @@ Payload txPower(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
-    {3952132, on<event::RrcChanged>(), rrcState, /*isCurrent=*/true},
+constexpr MetricKind kIceLteConnectionMetrics[] = {
+    {3952132, on<event::RrcChanged>(), lteRrcState, /*isCurrent=*/true},
     {3986195,
      on<event::CarriersChanged, event::ServingCellChanged, event::Measured>(),
      aggregation,
@@ -241,7 +241,7 @@ constexpr MetricKind kKinds[] = {
 }  // namespace
 
 std::span<const MetricKind> iceLteConnectionKinds() {
-  return kKinds;
+  return kIceLteConnectionMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

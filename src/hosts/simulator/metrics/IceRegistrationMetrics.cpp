@@ -40,7 +40,7 @@ bool isRegistered(const SubscriptionState& state) {
   return state.registration.state == RegistrationState::Registered;
 }
 
-bool isCombined(RegistrationProcedure procedure) {
+bool isCombinedProcedure(RegistrationProcedure procedure) {
   return procedure == RegistrationProcedure::CombinedAttach || procedure == RegistrationProcedure::CombinedAreaUpdate;
 }
 
@@ -98,7 +98,7 @@ Payload epsContext(const Moment& moment) {
 /// registrations that include them.
 bool hasOlderContexts(const SubscriptionState& state) {
   return state.technology == Technology::Umts || state.technology == Technology::Gsm ||
-         (state.technology == Technology::Lte && isCombined(state.registration.procedure));
+         (state.technology == Technology::Lte && isCombinedProcedure(state.registration.procedure));
 }
 
 std::int32_t failureCause(const RegistrationContext& registration) {
@@ -133,7 +133,7 @@ Payload circuitContext(const Moment& moment) {
   message.setLai(olderArea<KCellularLocationAreaId>(registration));
   message.setTmsi(registration.circuitTemporaryId);
   message.setT3212DurS(registration.periodicTimerSeconds);
-  message.setIsCombinedProc(isCombined(registration.procedure));
+  message.setIsCombinedProc(isCombinedProcedure(registration.procedure));
   return payload(message);
 }
 
@@ -236,7 +236,7 @@ Payload simFiles(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
+constexpr MetricKind kIceRegistrationMetrics[] = {
     {3986700, on<event::RegistrationAttempted>(), epsContext, /*isCurrent=*/true},
     {3986698, on<event::RegistrationAttempted>(), circuitContext, /*isCurrent=*/true},
     {3986699, on<event::RegistrationAttempted>(), packetContext, /*isCurrent=*/true},
@@ -247,7 +247,7 @@ constexpr MetricKind kKinds[] = {
 }  // namespace
 
 std::span<const MetricKind> iceRegistrationKinds() {
-  return kKinds;
+  return kIceRegistrationMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

@@ -20,13 +20,11 @@ using network::Technology;
 
 namespace {
 
-constexpr std::size_t kMostNeighbours = 8;
-
 const ServingMeasurement* umtsServing(const SubscriptionState& state) {
   return servingOn(state, Technology::Umts);
 }
 
-std::int32_t stateNumber(RrcState state) {
+std::int32_t umtsStateNumber(RrcState state) {
   using Message = KCellularWcdmaRrcConnectionState;
   switch (state) {
     case RrcState::None:
@@ -114,7 +112,7 @@ Payload connectionState(const Moment& moment) {
   }
   KCellularWcdmaRrcConnectionState message;
   setCommon(message, moment);
-  message.setState(stateNumber(state));
+  message.setState(umtsStateNumber(state));
   if (const auto established = establishmentCause(cause)) message.setEstablishmentCause(*established);
   if (const auto released = releaseCause(cause)) message.setReleaseCause(*released);
   return payload(message);
@@ -175,7 +173,7 @@ Payload umtsPower(const Moment& moment) {
   return payload(message);
 }
 
-Payload reselection(const Moment& moment) {
+Payload umtsReselection(const Moment& moment) {
   const SubscriptionState& state = moment.state;
   const ServingMeasurement* serving = umtsServing(state);
   if (serving == nullptr) return std::nullopt;
@@ -247,7 +245,7 @@ void addOtherNeighbour(KCellularWcdmaNbrCellMeas& message, const CellMeasurement
   }
 }
 
-Payload neighbours(const Moment& moment) {
+Payload umtsNeighbours(const Moment& moment) {
   const SubscriptionState& state = moment.state;
   if (umtsServing(state) == nullptr) return std::nullopt;
   KCellularWcdmaNbrCellMeas message;
@@ -276,21 +274,21 @@ Payload gsmCell(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
+constexpr MetricKind kIceUmtsMetrics[] = {
     {3985682, on<event::RrcChanged>(), connectionState, /*isCurrent=*/true},
     {3985683, on<event::ServingCellChanged, event::DrxChanged>(), configuration, /*isCurrent=*/true},
     {3944460, on<event::ServingCellChanged>(), umtsCell, /*isCurrent=*/true},
     {3985666, on<event::Measured>(), umtsMeasurement, /*isCurrent=*/true, {5000, 200}},
     {3985667, on<event::Measured>(), umtsPower, /*isCurrent=*/true, {5000, 200}},
-    {3985668, on<event::ServingCellChanged>(), reselection, /*isCurrent=*/true},
-    {3985669, on<event::Measured>(), neighbours, /*isCurrent=*/true, {10000, 400}},
+    {3985668, on<event::ServingCellChanged>(), umtsReselection, /*isCurrent=*/true},
+    {3985669, on<event::Measured>(), umtsNeighbours, /*isCurrent=*/true, {10000, 400}},
     {3943948, on<event::ServingCellChanged, event::RrcChanged>(), gsmCell, /*isCurrent=*/true},
 };
 
 }  // namespace
 
 std::span<const MetricKind> iceUmtsKinds() {
-  return kKinds;
+  return kIceUmtsMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

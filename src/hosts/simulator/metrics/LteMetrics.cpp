@@ -35,7 +35,7 @@ MessageRef<BandCombo> combination(const std::vector<const Cell*>& cells) {
 
 namespace {
 
-Payload servingCell(const Moment& moment) {
+Payload lteServingCell(const Moment& moment) {
   const ServingMeasurement* serving = lteServing(moment.state);
   if (serving == nullptr) return std::nullopt;
   const Cell& cell = *serving->best.cell;
@@ -72,7 +72,7 @@ void setAirType(CellularLteOtaMsg& message, AirType type) {
   }
 }
 
-Payload otaMsg(const Moment& moment) {
+Payload lteOtaMsg(const Moment& moment) {
   const auto* air = moment.get<event::AirMessage>();
   if (air == nullptr || air->cell->technology != Technology::Lte) return std::nullopt;
   const Cell& cell = *air->cell;
@@ -94,9 +94,8 @@ Payload otaMsg(const Moment& moment) {
   return payload(message);
 }
 
-Payload rachAttempt(const Moment& moment) {
+Payload lteRachAttempt(const Moment& moment) {
   using Attempt = CellularLteRachAttempt;
-  constexpr std::int32_t kMostPower = 23;  // dBm, power class 3
   const auto* attempt = moment.get<event::RachAttempt>();
   if (attempt == nullptr || attempt->cell->technology != Technology::Lte) return std::nullopt;
   constexpr std::int32_t kResults[] = {Attempt::LTE_RACH_RESULT_SUCCESS, Attempt::LTE_RACH_RESULT_FAIL_AT_MESG2,
@@ -108,7 +107,7 @@ Payload rachAttempt(const Moment& moment) {
   message.setRetxCounter(attempt->preambles - 1U);
   message.setRachResult(kResults[static_cast<std::size_t>(attempt->result)]);
   message.setContentionBased(attempt->isContentionBased);
-  message.setPMax(kMostPower);
+  message.setPMax(kMostLtePower);
   message.setRsrp(whole(attempt->power));
   message.setEarfcn(cell.downlinkChannel);
   message.setTac(cell.areaCode);
@@ -179,7 +178,7 @@ Payload levelHistogram(const Moment& moment) {
   return payload(message);
 }
 
-std::int32_t endCause(event::ConnectionEnd end) {
+std::int32_t lteEndCause(event::ConnectionEnd end) {
   using Stats = CellularLteConnectionStats;
   switch (end) {
     case event::ConnectionEnd::Release:
@@ -192,7 +191,7 @@ std::int32_t endCause(event::ConnectionEnd end) {
   return Stats::CONN_INFO_CAUSE_OTHER;
 }
 
-Payload connectionStats(const Moment& moment) {
+Payload lteConnectionStats(const Moment& moment) {
   constexpr std::uint32_t kAntennas = 4;
   const auto* ended = moment.get<event::ConnectionEnded>();
   if (ended == nullptr || ended->technology != Technology::Lte) return std::nullopt;
@@ -219,28 +218,28 @@ Payload connectionStats(const Moment& moment) {
   ability->setMaxRxAnt(kAntennas);
   ability->setMaxSchdMimoLyr(use.maxLayersScheduled);
   message.addNwUeCapStat(ability);
-  message.setCause(endCause(ended->end));
+  message.setCause(lteEndCause(ended->end));
   message.setConnDuration(duration);
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
+constexpr MetricKind kLteMetrics[] = {
     {803010,
      on<event::ServingCellChanged, event::Measured>(),
-     servingCell,
+     lteServingCell,
      /*isCurrent=*/true,
      {30000, 600}},
-    {803011, on<event::AirMessage>(), otaMsg},
+    {803011, on<event::AirMessage>(), lteOtaMsg},
     {803104, on<event::RachAttempt>(), rachAttempt},
     {806674, on<event::Measured>(), stateHistory, /*isCurrent=*/true, {120000, 60000}, /*counts=*/true},
     {806660, on<event::Measured>(), levelHistogram, /*isCurrent=*/true, {20000, 200}, /*counts=*/true},
-    {806743, on<event::ConnectionEnded>(), connectionStats},
+    {806743, on<event::ConnectionEnded>(), lteConnectionStats},
 };
 
 }  // namespace
 
 std::span<const MetricKind> lteKinds() {
-  return kKinds;
+  return kLteMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

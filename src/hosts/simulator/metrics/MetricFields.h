@@ -14,6 +14,9 @@ namespace quorl::simulator::metrics {
 
 using Payload = std::optional<ByteString>;
 
+constexpr std::size_t kMostNeighbours = 8;  // of a technology in one metric
+constexpr std::int32_t kMostLtePower = 23;  // dBm, power class 3
+
 /// What a finished message is on the wire.
 ByteString payload(const MetricCodable& message);
 

@@ -77,7 +77,7 @@ std::int32_t channelNumber(AirChannel channel) {
   return 0;
 }
 
-Payload otaMsg(const Moment& moment) {
+Payload nrOtaMsg(const Moment& moment) {
   const auto* air = moment.get<event::AirMessage>();
   if (air == nullptr || air->cell->technology != Technology::Nr) return std::nullopt;
   const Cell& cell = *air->cell;
@@ -111,7 +111,7 @@ Payload otaMsg(const Moment& moment) {
   return payload(message);
 }
 
-Payload servingCell(const Moment& moment) {
+Payload nrServingCell(const Moment& moment) {
   const ServingMeasurement* serving = nrServing(moment.state);
   if (serving == nullptr) return std::nullopt;
   const Cell& cell = *serving->best.cell;
@@ -122,7 +122,7 @@ Payload servingCell(const Moment& moment) {
   return payload(message);
 }
 
-Payload rachAttempt(const Moment& moment) {
+Payload nrRachAttempt(const Moment& moment) {
   constexpr network::Centi kOpenLoopPower = 1000;
   const auto* attempt = moment.get<event::RachAttempt>();
   if (attempt == nullptr || attempt->cell->technology != Technology::Nr) return std::nullopt;
@@ -165,12 +165,12 @@ Payload beamSwitch(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
+constexpr MetricKind kNrCellMetrics[] = {
     {806912, on<event::SystemInformationRead>(), sysInfoBlocks},
-    {806913, on<event::AirMessage>(), otaMsg},
+    {806913, on<event::AirMessage>(), nrOtaMsg},
     {806914,
      on<event::ServingCellChanged, event::SecondaryGroupAdded, event::Measured>(),
-     servingCell,
+     nrServingCell,
      /*isCurrent=*/true,
      {30000, 600}},
     {806915, on<event::RachAttempt>(), rachAttempt},
@@ -180,7 +180,7 @@ constexpr MetricKind kKinds[] = {
 }  // namespace
 
 std::span<const MetricKind> nrCellKinds() {
-  return kKinds;
+  return kNrCellMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

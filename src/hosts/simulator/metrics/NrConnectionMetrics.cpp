@@ -20,7 +20,7 @@ namespace {
 
 constexpr std::uint32_t kMostBearers = 4;
 
-std::uint32_t stateNumber(RrcState state) {
+std::uint32_t nrStateNumber(RrcState state) {
   switch (state) {
     case RrcState::Connected:
       return 2;
@@ -31,16 +31,16 @@ std::uint32_t stateNumber(RrcState state) {
   }
 }
 
-Payload rrcState(const Moment& moment) {
+Payload nrRrcState(const Moment& moment) {
   CellularNrRrcState message;
   setCommon(message, moment);
   if (const auto* changed = moment.get<event::RrcChanged>()) {
     if (changed->technology != Technology::Nr) return std::nullopt;
-    message.setState(stateNumber(changed->state));
+    message.setState(nrStateNumber(changed->state));
     message.setDeployment(changed->isNonStandAlone ? DEPLOYMENT_NSA : DEPLOYMENT_SA);
   } else {
     if (nrServing(moment.state) == nullptr) return std::nullopt;
-    message.setState(moment.state.nr ? stateNumber(RrcState::Connected) : stateNumber(moment.state.rrc));
+    message.setState(moment.state.nr ? nrStateNumber(RrcState::Connected) : nrStateNumber(moment.state.rrc));
     message.setDeployment(moment.state.nr ? DEPLOYMENT_NSA : DEPLOYMENT_SA);
   }
   return payload(message);
@@ -228,7 +228,7 @@ Payload endcUsage(const Moment& moment) {
   return payload(message);
 }
 
-std::int32_t endCause(event::ConnectionEnd end) {
+std::int32_t nrEndCause(event::ConnectionEnd end) {
   using Stats = CellularNrConnectionStats;
   switch (end) {
     case event::ConnectionEnd::Release:
@@ -241,7 +241,7 @@ std::int32_t endCause(event::ConnectionEnd end) {
   return Stats::CONN_INFO_FLUSH_REASON_OTHER1;
 }
 
-Payload connectionStats(const Moment& moment) {
+Payload nrConnectionStats(const Moment& moment) {
   using Stats = CellularNrConnectionStats;
   const auto* ended = moment.get<event::ConnectionEnded>();
   if (ended == nullptr || ended->technology != Technology::Nr) return std::nullopt;
@@ -264,7 +264,7 @@ Payload connectionStats(const Moment& moment) {
   message.setNr5gTotalDlMimoLayers(use.maxTotalLayers);
   message.setNr5gBandCombo(combination({&cell}));
   message.setConnDuration(u32(ended->durationMs));
-  message.setCause(endCause(ended->end));
+  message.setCause(nrEndCause(ended->end));
   return payload(message);
 }
 
@@ -296,8 +296,8 @@ Payload savingRelease(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
-    {806917, on<event::RrcChanged>(), rrcState, /*isCurrent=*/true},
+constexpr MetricKind kNrConnectionMetrics[] = {
+    {806917, on<event::RrcChanged>(), nrRrcState, /*isCurrent=*/true},
     {806919, on<event::SecondaryGroupAdded>(), scgAddition},
     {806920, on<event::SecondaryGroupRemoved>(), scgRemoval},
     {806928, on<event::NrResumed>(), rrcResume},
@@ -309,7 +309,7 @@ constexpr MetricKind kKinds[] = {
      {60000, 200},
      /*counts=*/true},
     {806933, on<event::SecondaryGroupRemoved>(), endcUsage},
-    {806934, on<event::ConnectionEnded>(), connectionStats},
+    {806934, on<event::ConnectionEnded>(), nrConnectionStats},
     {806936, on<event::SavingChanged>(), savingActivation},
     {806937, on<event::SavingChanged>(), savingRelease},
 };
@@ -317,7 +317,7 @@ constexpr MetricKind kKinds[] = {
 }  // namespace
 
 std::span<const MetricKind> nrConnectionKinds() {
-  return kKinds;
+  return kNrConnectionMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

@@ -136,7 +136,7 @@ Payload simHplmn(const Moment& moment) {
   return payload(message);
 }
 
-constexpr MetricKind kKinds[] = {
+constexpr MetricKind kServiceMetrics[] = {
     {827652, on<event::RegistrationAttempted>(), regAttempt},
     {827650, on<event::PlmnChanged>(), registeredPlmn, /*isCurrent=*/true},
     {827747, on<event::ServiceChanged, event::ServingCellChanged, event::PlmnChanged>(), ratLacService,
@@ -150,7 +150,7 @@ constexpr MetricKind kKinds[] = {
 }  // namespace
 
 std::span<const MetricKind> serviceKinds() {
-  return kKinds;
+  return kServiceMetrics;
 }
 
 }  // namespace quorl::simulator::metrics

@@ -16,10 +16,6 @@ constexpr std::uint8_t kTemporaryFailure = 41;
 
 constexpr SimulatedMs kRingingMs = 25000;
 
-bool isPacketCell(Technology technology) {
-  return technology == Technology::Lte || technology == Technology::Nr;
-}
-
 }  // namespace
 
 void Calls::powerOn() {

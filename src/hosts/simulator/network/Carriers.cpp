@@ -18,7 +18,6 @@ constexpr SimulatedMs kGroupTriggerMs = 320;
 constexpr SimulatedMs kWeakMs = 640;
 constexpr SimulatedMs kRecoveryMs = 1000;
 constexpr SimulatedMs kQuietMs = 2000;
-constexpr std::uint16_t kT310Ms = 1000;
 
 void widen(ConnectionUse& use, const ServingMeasurement& serving, std::size_t carriers, unsigned layers) {
   use.maxDownlink = std::max(use.maxDownlink, serving.downlink);

@@ -11,6 +11,10 @@ namespace quorl::simulator::network {
 
 enum class Technology : std::uint8_t { None, Gsm, Umts, Lte, Nr };
 
+constexpr bool isPacketCell(Technology technology) {
+  return technology == Technology::Lte || technology == Technology::Nr;
+}
+
 /// Milliseconds since the start of the run.
 using SimulatedMs = std::uint64_t;
 /// 1/100 dBm or 1/100 dB.

@@ -17,11 +17,6 @@ constexpr Centi kGoodUmts = -10600;
 constexpr Centi kGoodGsm = -9800;
 constexpr std::uint32_t kN310 = 3;
 constexpr std::uint32_t kN311 = 2;
-constexpr std::uint16_t kT310Ms = 1000;
-
-bool isPacketCell(Technology technology) {
-  return technology == Technology::Lte || technology == Technology::Nr;
-}
 
 /// TS 36.133 7.6: the control channel fails in a tenth of the cases below about -8 dB, in a fiftieth above -6 dB.
 bool isOut(const CellMeasurement& measurement) {

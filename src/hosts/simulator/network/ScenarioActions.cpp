@@ -16,7 +16,7 @@ std::uint8_t slotSetting(ScenarioLine& line) {
 bool choice(ScenarioLine& line, std::string_view yes, std::string_view no) {
   const std::string what = std::string(yes) + " or " + std::string(no);
   const std::string word = line.word(what);
-  if (word != yes && word != no) throw BadScenarioLine("must be " + what + ": " + word);
+  if (word != yes && word != no) throw BadScenarioLine("must be {}: {}", what, word);
   return word == yes;
 }
 
@@ -68,7 +68,7 @@ action::Action takeAction(ScenarioLine& line) {
   if (word == "malformed") return traffic(line, event::CueKind::Malformed);
   if (word == "oversized") return traffic(line, event::CueKind::Oversized);
   if (word == "burst") return traffic(line, event::CueKind::Burst);
-  throw BadScenarioLine("nothing happens by that name: " + word);
+  throw BadScenarioLine("nothing happens by that name: {}", word);
 }
 
 std::optional<std::uint8_t> slotOf(const action::Action& action) {

@@ -11,11 +11,6 @@
 namespace quorl::simulator::network {
 namespace {
 
-template <typename... Args>
-[[noreturn]] void bad(fmt::format_string<Args...> form, Args&&... args) {
-  throw BadScenarioLine(fmt::format(form, std::forward<Args>(args)...));
-}
-
 bool isBlank(char c) {
   return c == ' ' || c == '\t' || c == '\r';
 }
@@ -34,7 +29,7 @@ ScenarioLine::ScenarioLine(std::string_view line) {
     bool isQuoted = false;
     while (at < line.size() && (isQuoted || !isBlank(line[at]))) {
       const char c = line[at++];
-      if (static_cast<unsigned char>(c) < 0x20 && c != '\t') bad("a control character");
+      if (static_cast<unsigned char>(c) < 0x20 && c != '\t') throw BadScenarioLine("a control character");
       if (c == '"') {
         isQuoted = !isQuoted;
       } else if (c == '=' && !isQuoted && word.key.empty() && !word.text.empty()) {
@@ -44,7 +39,7 @@ ScenarioLine::ScenarioLine(std::string_view line) {
         word.text += c;
       }
     }
-    if (isQuoted) bad("a text without its closing quote");
+    if (isQuoted) throw BadScenarioLine("a text without its closing quote");
     words_.push_back(std::move(word));
   }
 }
@@ -55,7 +50,7 @@ std::string ScenarioLine::word(std::string_view what) {
     word.isTaken = true;
     return word.text;
   }
-  bad("{} is missing", what);
+  throw BadScenarioLine("{} is missing", what);
 }
 
 double ScenarioLine::number(std::string_view what, double low, double high) {
@@ -79,7 +74,7 @@ std::optional<std::string> ScenarioLine::setting(std::string_view key) {
   std::optional<std::string> found;
   for (Word& word : words_) {
     if (word.key != key) continue;
-    if (found) bad("{} stands twice", key);
+    if (found) throw BadScenarioLine("{} stands twice", key);
     word.isTaken = true;
     found = word.text;
   }
@@ -88,14 +83,14 @@ std::optional<std::string> ScenarioLine::setting(std::string_view key) {
 
 std::string ScenarioLine::neededSetting(std::string_view key) {
   auto found = setting(key);
-  if (!found) bad("{}= is missing", key);
+  if (!found) throw BadScenarioLine("{}= is missing", key);
   return *std::move(found);
 }
 
 double ScenarioLine::numberSetting(std::string_view key, std::optional<double> otherwise, double low, double high) {
   const auto found = setting(key);
   if (!found && otherwise) return *otherwise;
-  if (!found) bad("{}= is missing", key);
+  if (!found) throw BadScenarioLine("{}= is missing", key);
   return parseNumber(*found, key, low, high);
 }
 
@@ -103,7 +98,7 @@ std::int64_t ScenarioLine::wholeSetting(std::string_view key, std::optional<std:
                                         std::int64_t high) {
   const auto found = setting(key);
   if (!found && otherwise) return *otherwise;
-  if (!found) bad("{}= is missing", key);
+  if (!found) throw BadScenarioLine("{}= is missing", key);
   return parseWhole(*found, key, low, high);
 }
 
@@ -114,7 +109,7 @@ std::vector<std::string> ScenarioLine::listSetting(std::string_view key) {
   std::string_view rest = *found;
   while (true) {
     const std::size_t comma = rest.find(',');
-    if (rest.substr(0, comma).empty()) bad("{}= has an empty entry", key);
+    if (rest.substr(0, comma).empty()) throw BadScenarioLine("{}= has an empty entry", key);
     list.emplace_back(rest.substr(0, comma));
     if (comma == std::string_view::npos) return list;
     rest.remove_prefix(comma + 1);
@@ -124,8 +119,8 @@ std::vector<std::string> ScenarioLine::listSetting(std::string_view key) {
 void ScenarioLine::finish() const {
   for (const Word& word : words_) {
     if (word.isTaken) continue;
-    if (word.key.empty()) bad("\"{}\" has no meaning here", word.text);
-    bad("{}= has no meaning here", word.key);
+    if (word.key.empty()) throw BadScenarioLine("\"{}\" has no meaning here", word.text);
+    throw BadScenarioLine("{}= has no meaning here", word.key);
   }
 }
 
@@ -133,8 +128,8 @@ double ScenarioLine::parseNumber(std::string_view text, std::string_view what, d
   double value = 0;
   const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
   if (error != std::errc() || end != text.data() + text.size() || !std::isfinite(value))
-    bad("{} is no number: {}", what, text);
-  if (value < low || value > high) bad("{} must be between {} and {}", what, low, high);
+    throw BadScenarioLine("{} is no number: {}", what, text);
+  if (value < low || value > high) throw BadScenarioLine("{} must be between {} and {}", what, low, high);
   return value;
 }
 
@@ -142,9 +137,10 @@ std::int64_t ScenarioLine::parseWhole(std::string_view text, std::string_view wh
                                       std::int64_t high) {
   std::int64_t value = 0;
   const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
-  if (error == std::errc::result_out_of_range) bad("{} must be between {} and {}", what, low, high);
-  if (error != std::errc() || end != text.data() + text.size()) bad("{} is no whole number: {}", what, text);
-  if (value < low || value > high) bad("{} must be between {} and {}", what, low, high);
+  if (error == std::errc::result_out_of_range) throw BadScenarioLine("{} must be between {} and {}", what, low, high);
+  if (error != std::errc() || end != text.data() + text.size())
+    throw BadScenarioLine("{} is no whole number: {}", what, text);
+  if (value < low || value > high) throw BadScenarioLine("{} must be between {} and {}", what, low, high);
   return value;
 }
 
@@ -169,7 +165,7 @@ std::uint64_t ScenarioLine::time(std::string_view text) {
     }
     rest.remove_prefix(colon + 1);
   }
-  bad("time must be hours:minutes:seconds, minutes:seconds or a number with s: {}", text);
+  throw BadScenarioLine("time must be hours:minutes:seconds, minutes:seconds or a number with s: {}", text);
 }
 
 }  // namespace quorl::simulator::network

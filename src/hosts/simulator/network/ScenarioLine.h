@@ -5,13 +5,19 @@
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
+
+#include <fmt/format.h>
 
 namespace quorl::simulator::network {
 
 /// A line is not as the form tells; `what` says how.
 class BadScenarioLine : public std::runtime_error {
-  using std::runtime_error::runtime_error;
+ public:
+  template <typename... Args>
+  explicit BadScenarioLine(fmt::format_string<Args...> form, Args&&... args)
+      : std::runtime_error(fmt::format(form, std::forward<Args>(args)...)) {}
 };
 
 /// The words of one line: plain ones, taken in their order, and settings of the form key=value, taken by their key. A

@@ -21,11 +21,6 @@ constexpr double kFarthest = 1e6;  // metres
 constexpr std::size_t kMostCells = 5000;
 constexpr std::size_t kMostProblems = 100;
 
-template <typename... Args>
-[[noreturn]] void bad(fmt::format_string<Args...> form, Args&&... args) {
-  throw BadScenarioLine(fmt::format(form, std::forward<Args>(args)...));
-}
-
 template <typename Value, std::size_t Count>
 Value oneOf(const std::string& word, std::string_view what,
             const std::array<std::pair<std::string_view, Value>, Count>& names) {
@@ -34,7 +29,7 @@ Value oneOf(const std::string& word, std::string_view what,
     if (name == word) return value;
     allowed += (allowed.empty() ? "" : ", ") + std::string(name);
   }
-  bad("{} must be one of {}: {}", what, allowed, word);
+  throw BadScenarioLine("{} must be one of {}: {}", what, allowed, word);
 }
 
 /// Takes the lines of one file.
@@ -103,13 +98,13 @@ class Builder {
   void network(ScenarioLine& line) {
     Operator added;
     added.id = line.word("a name");
-    if (findOperator(added.id)) bad("network {} stands twice", added.id);
-    if (scenario_.operators.size() >= 8) bad("more than 8 networks");
+    if (findOperator(added.id)) throw BadScenarioLine("network {} stands twice", added.id);
+    if (scenario_.operators.size() >= 8) throw BadScenarioLine("more than 8 networks");
     const std::string code = line.word("a network code");
     const std::size_t dash = code.find('-');
     const std::size_t digits = code.size() - std::min(code.size(), dash + 1);
     if (dash != 3 || (digits != 2 && digits != 3))
-      bad("a network code has 3 digits, a dash and 2 or 3 digits: {}", code);
+      throw BadScenarioLine("a network code has 3 digits, a dash and 2 or 3 digits: {}", code);
     added.plmn.mcc = static_cast<std::uint16_t>(ScenarioLine::parseWhole(code.substr(0, 3), "country code", 1, 999));
     added.plmn.mnc = static_cast<std::uint16_t>(ScenarioLine::parseWhole(code.substr(4), "network code", 0, 999));
     added.plmn.mncDigits = static_cast<std::uint8_t>(digits);
@@ -121,7 +116,7 @@ class Builder {
     Layer added;
     added.operatorIndex = takeOperator(line);
     added.id = line.word("a layer");
-    if (findLayer(added.operatorIndex, added.id)) bad("layer {} stands twice", added.id);
+    if (findLayer(added.operatorIndex, added.id)) throw BadScenarioLine("layer {} stands twice", added.id);
     constexpr std::array<std::pair<std::string_view, Technology>, 4> kNames{
         {{"gsm", Technology::Gsm}, {"umts", Technology::Umts}, {"lte", Technology::Lte}, {"nr", Technology::Nr}}};
     added.technology = oneOf(line.word("a technology"), "technology", kNames);
@@ -135,7 +130,7 @@ class Builder {
     added.ports = static_cast<std::uint8_t>(line.wholeSetting("ports", isGsm || isUmts ? 1 : 2, 1, 4));
     added.beams = static_cast<std::uint8_t>(line.wholeSetting("beams", 1, 1, 8));
     added.isStandAlone = line.flag("standalone");
-    if (added.isStandAlone && added.technology != Technology::Nr) bad("only nr can be standalone");
+    if (added.isStandAlone && added.technology != Technology::Nr) throw BadScenarioLine("only nr can be standalone");
     const std::int64_t priority = isGsm ? 1 : isUmts ? 2 : added.technology == Technology::Lte ? 5 : 7;
     added.priority = static_cast<std::uint8_t>(line.wholeSetting("priority", priority, 0, 7));
     checkCarrier(added);
@@ -147,9 +142,9 @@ class Builder {
     const std::uint32_t last = layer.channel + (layer.technology == Technology::Gsm ? 22U : 0U);
     const auto found = frequencies(layer.technology, layer.band, layer.channel);
     if (!found || !frequencies(layer.technology, layer.band, last))
-      bad("channel {} does not belong to band {}", layer.channel, layer.band);
+      throw BadScenarioLine("channel {} does not belong to band {}", layer.channel, layer.band);
     if (!resourceBlocks(layer.technology, layer.bandwidthMhzX10, found->isTdd))
-      bad("no carrier is {} MHz wide there", layer.bandwidthMhzX10 / 10.0);
+      throw BadScenarioLine("no carrier is {} MHz wide there", layer.bandwidthMhzX10 / 10.0);
   }
 
   /// What site and grid have in common, place aside.
@@ -160,10 +155,10 @@ class Builder {
     site.areaCode = static_cast<std::uint32_t>(line.wholeSetting("area", std::nullopt, 1, 65533));
     for (const std::string& id : line.listSetting("layers")) {
       const auto layer = findLayer(operatorIndex, id);
-      if (!layer) bad("no layer of that name in this network: {}", id);
+      if (!layer) throw BadScenarioLine("no layer of that name in this network: {}", id);
       site.layers.push_back(*layer);
     }
-    if (site.layers.empty()) bad("layers= is missing");
+    if (site.layers.empty()) throw BadScenarioLine("layers= is missing");
     const std::string sectors = line.setting("sectors").value_or("0,120,240");
     if (sectors == "none") return site;
     for (std::string_view rest = sectors;;) {
@@ -173,13 +168,13 @@ class Builder {
       if (comma == std::string_view::npos) break;
       rest.remove_prefix(comma + 1);
     }
-    if (site.azimuths.size() > 6) bad("more than 6 sectors");
+    if (site.azimuths.size() > 6) throw BadScenarioLine("more than 6 sectors");
     return site;
   }
 
   void addSite(const Site& site) {
     cells_ += site.layers.size() * std::max<std::size_t>(1, site.azimuths.size());
-    if (cells_ > kMostCells) bad("more than {} cells", kMostCells);
+    if (cells_ > kMostCells) throw BadScenarioLine("more than {} cells", kMostCells);
     scenario_.sites.push_back(site);
   }
 
@@ -215,14 +210,15 @@ class Builder {
   }
 
   void zone(ScenarioLine& line) {
-    if (scenario_.zones.size() >= kMostZones) bad("more than {} zones", kMostZones);
+    if (scenario_.zones.size() >= kMostZones) throw BadScenarioLine("more than {} zones", kMostZones);
     Zone added;
     added.name = line.word("a name");
     added.left = line.number("left", -kFarthest, kFarthest);
     added.bottom = line.number("bottom", -kFarthest, kFarthest);
     added.right = line.number("right", -kFarthest, kFarthest);
     added.top = line.number("top", -kFarthest, kFarthest);
-    if (added.left >= added.right || added.bottom >= added.top) bad("a zone goes from left to right and bottom to top");
+    if (added.left >= added.right || added.bottom >= added.top)
+      throw BadScenarioLine("a zone goes from left to right and bottom to top");
     added.loss = static_cast<Centi>(line.numberSetting("loss", std::nullopt, 0, 120) * 100.0);
     scenario_.zones.push_back(std::move(added));
   }
@@ -265,7 +261,7 @@ class Builder {
   void sim(ScenarioLine& line) {
     const auto slot = static_cast<std::size_t>(line.whole("slot", 1, 2) - 1);
     Sim& added = scenario_.sims[slot];
-    if (added.isPresent) bad("slot {} has a sim already", slot + 1);
+    if (added.isPresent) throw BadScenarioLine("slot {} has a sim already", slot + 1);
     Sim read;
     read.isPresent = true;
     read.operatorIndex = takeOperator(line);
@@ -289,7 +285,7 @@ class Builder {
   void every(ScenarioLine& line) {
     ScriptStep step;
     step.everyMs = ScenarioLine::time(line.word("a time"));
-    if (step.everyMs < 100) bad("a repetition comes 0.1 s after the last at the earliest");
+    if (step.everyMs < 100) throw BadScenarioLine("a repetition comes 0.1 s after the last at the earliest");
     const auto from = line.setting("from");
     step.atMs = from ? ScenarioLine::time(*from) : step.everyMs;
     step.action = takeAction(line);
@@ -303,7 +299,7 @@ class Builder {
   }
   std::uint8_t needOperator(const std::string& id) const {
     const auto found = findOperator(id);
-    if (!found) bad("no network of that name: {}", id);
+    if (!found) throw BadScenarioLine("no network of that name: {}", id);
     return *found;
   }
   std::uint8_t takeOperator(ScenarioLine& line) const { return needOperator(line.word("a network")); }

@@ -28,6 +28,8 @@ struct Phone {
   std::uint32_t lastCallId = 0;
 };
 
+inline constexpr std::uint16_t kT310Ms = 1000;
+
 enum class Timer : std::uint8_t {
   Measure,
   Search,
