@@ -35,10 +35,7 @@ class DashboardTest : public test::ScreenTest {
   /// A dashboard of the two attributes "power" and "band" of subscription 0.
   void openWithTwoReadings() {
     launch();
-    pinned("LTE", "Tx Power", "power");
-    pinned("LTE", "Tx Power", "band");
-    stored(reading("LTE", "Tx Power", "power", "11"));
-    stored(reading("LTE", "Tx Power", "band", "3"));
+    hasADashboard();
     open();
     log.clear();
   }
@@ -57,6 +54,19 @@ class DashboardTest : public test::ScreenTest {
     settle();
   }
 
+  void load() {
+    model->loadDashboardData([this](const auto& rows, const auto&) {
+      if (rows) ++completed;
+    });
+  }
+  /// One statement, and what it brings about.
+  void step() {
+    databaseQueue().step();
+    while (platform.mainQueue->step()) {
+    }
+  }
+
+  int completed = 0;
   std::shared_ptr<DashboardScreen> screen = std::make_shared<DashboardScreen>();
   std::shared_ptr<DashboardViewModel> model;
 };
@@ -402,40 +412,22 @@ TEST_F(DashboardTest, MayGoWhileItLoads) {
 
 TEST_F(DashboardTest, OverlappingLoadsWaitForTheSumOfBoth) {
   openWithTwoReadings();
-  int completed = 0;
-  const auto count = [&](const auto& rows, const auto&) {
-    if (rows) ++completed;
-  };
-  const auto step = [&] {
-    databaseQueue().step();
-    while (platform.mainQueue->step()) {
-    }
-  };
-  model->loadDashboardData(count);
+  load();
   step();  // the pins of the first load; its two readings wait
-  model->loadDashboardData(count);
+  load();
   step();  // a reading of the first
   step();  // the other; the pins of the second come behind
   EXPECT_EQ(completed, 1);
   step();
-  model->loadDashboardData(count);
+  load();
   settle();
   EXPECT_EQ(completed, 3);
 }
 
 TEST_F(DashboardTest, ALoadWaitsForTheReadingsOfTheLoadThatCameWhileItRead) {
   openWithTwoReadings();
-  int completed = 0;
-  const auto count = [&](const auto& rows, const auto&) {
-    if (rows) ++completed;
-  };
-  const auto step = [&] {
-    databaseQueue().step();
-    while (platform.mainQueue->step()) {
-    }
-  };
-  model->loadDashboardData(count);
-  model->loadDashboardData(count);
+  load();
+  load();
   step();
   step();  // the pins of both: four readings wait
   EXPECT_EQ(databaseQueue().waiting(), 4U);

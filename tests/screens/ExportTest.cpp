@@ -1,6 +1,7 @@
 #include "ScreenTest.h"
 #include "screens/export/ExportText.h"
 #include "screens/export/ExportViewController.h"
+#include "support/Reading.h"
 
 namespace quorl {
 namespace {
@@ -13,15 +14,10 @@ using ::testing::SizeIs;
 using namespace std::chrono_literals;
 
 Metric exampleRow() {
-  Metric metric;
+  Metric metric =
+      test::readingAt(Date(std::chrono::seconds(1767605412)), "LTE", "Serving Cell Info", "dl_freq", "5230");
   metric.id = Uuid{{0x6D, 0x9C, 0x1C, 0x4A, 0, 0, 0x40, 0, 0x80, 0, 0, 0, 0, 0, 0, 0}};
-  metric.metricTech = "LTE";
-  metric.metricName = "Serving Cell Info";
-  metric.attributeName = "dl_freq";
-  metric.attributeNameNonLocalized = "dl_freq";
-  metric.attributeValue = "5230";
-  metric.collectedOn = Date(std::chrono::seconds(1767605412));
-  metric.metricId = "803010";
+  metric.attributeValueType.clear();
   return metric;
 }
 

@@ -8,6 +8,7 @@
 #include "base/NotificationCenter.h"
 #include "intake/ZelkorWrapper.h"
 #include "shell/NotificationNames.h"
+#include "support/Reading.h"
 
 namespace quorl::test {
 
@@ -36,18 +37,8 @@ void ScreenTest::relaunch() {
 
 Metric ScreenTest::reading(std::string metricTech, std::string metricName, std::string attributeName, std::string value,
                            std::int32_t subsId) const {
-  Metric metric;
-  metric.id = Uuid::make();
-  metric.metricTech = std::move(metricTech);
-  metric.metricName = std::move(metricName);
-  metric.attributeName = attributeName;
-  metric.attributeNameNonLocalized = std::move(attributeName);
-  metric.attributeValue = std::move(value);
-  metric.attributeValueType = "INT";
-  metric.collectedOn = now();
-  metric.metricId = "803010";
-  metric.subsId = subsId;
-  return metric;
+  return readingAt(now(), std::move(metricTech), std::move(metricName), std::move(attributeName), std::move(value),
+                   subsId);
 }
 
 void ScreenTest::stored(const Metric& metric) {
@@ -71,6 +62,13 @@ void ScreenTest::pinned(const std::string& metricTech, const std::string& metric
                         std::int32_t subsId) {
   sql("INSERT INTO Dashboard (metric_tech, metric_id, metric_name, attribute_name, subs_id) VALUES ('" + metricTech +
       "', '803010', '" + metricName + "', '" + attributeName + "', " + std::to_string(subsId) + ")");
+}
+
+void ScreenTest::hasADashboard() {
+  pinned("LTE", "Tx Power", "power");
+  pinned("LTE", "Tx Power", "band");
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  stored(reading("LTE", "Tx Power", "band", "3"));
 }
 
 void ScreenTest::chooses(std::int32_t subsId) {

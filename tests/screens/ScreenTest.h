@@ -55,6 +55,8 @@ class ScreenTest : public ::testing::Test {
   void announced(const Metric& metric);
   void pinned(const std::string& metricTech, const std::string& metricName, const std::string& attributeName,
               std::int32_t subsId = 0);
+  /// Two readings on the dashboard, "power" and "band" of subscription 0: the fewest that count.
+  void hasADashboard();
   /// The user chooses a subscription.
   void chooses(std::int32_t subsId);
 

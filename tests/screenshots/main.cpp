@@ -12,6 +12,7 @@
 
 #include <fmt/format.h>
 
+#include "hosts/simulator/PhoneServices.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/SondrelSimulator.h"
 #include "hosts/simulator/TelephonyScript.h"
@@ -46,6 +47,7 @@ class Photographer : public WindowPhone {
       : folder_(std::move(folder)), look_(look), events_(events) {
     view::Appearance::shared().setDark(look.isDark);
     setSize(look.size.width(), look.size.height());
+    phone.strings.rest = &strings_;
     isInternalBuild();
     hasLogCapture();
     simulator::SondrelSimulator::Options capture;
@@ -157,6 +159,7 @@ class Photographer : public WindowPhone {
     for (const std::string& warning : takeWarnings()) std::cerr << name << ": " << warning << '\n';
   }
 
+  simulator::GettextStrings strings_{{std::filesystem::path(QUORL_BINARY_DIR) / "share" / "quorl"}};
   std::unique_ptr<simulator::SondrelSimulator> library_;
   const std::filesystem::path folder_;
   const Look look_;
@@ -176,6 +179,7 @@ int photograph(const std::filesystem::path& folder) {
   std::filesystem::create_directories(folder);
   const ScopedTimeZone zone("UTC");
   const ScopedLocale locale("en_US");
+  const ScopedLanguage language("en");
   const auto recording = simulator::readRecording(kResources / "recordings" / "mav.jsonl");
   if (!recording) throw std::runtime_error(recording.error());
   for (const bool isDark : {false, true}) {

@@ -8,11 +8,14 @@
 
 #include "base/SerialQueue.h"
 #include "hosts/simulator/BasebandManager.h"
+#include "simulator/ManagerCommands.h"
 #include "support/SteppedQueue.h"
 
 namespace quorl::simulator {
 namespace {
 
+using test::clearConfiguration;
+using test::queryMetric;
 using zelkor::KeyValueMessage;
 
 constexpr char kConfiguration[] = R"({
@@ -34,24 +37,6 @@ std::string configurationOf(std::string_view metrics) {
   std::string content(kConfiguration);
   content.replace(content.find("[806915"), std::string_view("[806915, 803010, 827648]").size(), metrics);
   return content;
-}
-
-KeyValueMessage clearConfiguration() {
-  KeyValueMessage message;
-  message.set(zelkor::kKeyAppID, std::int64_t{2});
-  return message;
-}
-
-KeyValueMessage queryMetric() {
-  KeyValueMessage message;
-  message.set(zelkor::kKeyAppID, std::int64_t{2});
-  message.set(zelkor::kKeyPayloadType, std::int64_t{0});
-  message.set(zelkor::kKeyTriggerRef, std::int64_t{9999});
-  message.set(zelkor::kKeyTriggerType, std::int64_t{0});
-  message.set(zelkor::kKeyTriggerID, std::int64_t{5202011});
-  message.set(zelkor::kKeyProfileID, std::int64_t{0});
-  message.set(zelkor::kKeyMetricID, std::int64_t{0});
-  return message;
 }
 
 KeyValueMessage without(const KeyValueMessage& message, std::string_view key) {

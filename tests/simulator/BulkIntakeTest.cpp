@@ -14,6 +14,7 @@
 #include "store/PersistanceStore.h"
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
+#include "support/Reading.h"
 #include "support/TimeZone.h"
 #include "support/VirtualTimeVfs.h"
 
@@ -105,16 +106,9 @@ INSTANTIATE_TEST_SUITE_P(Families, BulkIntakeTest, testing::Values("mav", "ice")
 class BulkStoreTest : public testing::Test {
  protected:
   static Metric row(std::string value) {
-    Metric metric;
-    metric.metricTech = "LTE";
-    metric.metricName = "Serving Cell Info";
-    metric.attributeName = "dl_freq";
-    metric.attributeValue = std::move(value);
-    metric.attributeValueType = "INT";
-    metric.metricId = "803010";
+    Metric metric = test::readingAt(Date(std::chrono::seconds(1767605412)), "LTE", "Serving Cell Info", "dl_freq",
+                                    std::move(value), 1);
     metric.graphable = true;
-    metric.subsId = 1;
-    metric.collectedOn = Date(std::chrono::seconds(1767605412));
     return metric;
   }
   std::vector<test::Row> stored(const char* sql) { return test::RawDatabase(file).run(sql); }

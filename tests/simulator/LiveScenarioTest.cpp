@@ -19,6 +19,7 @@
 #include "intake/ZelkorWrapper.h"
 #include "messages/MessageTable.h"
 #include "messages/MetricCodable.h"
+#include "simulator/ManagerCommands.h"
 #include "store/PersistanceStore.h"
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
@@ -70,20 +71,10 @@ class LiveScenarioTest : public testing::Test {
     ASSERT_EQ(perform(zelkor::kCommandAddConfiguration, message), 0);
   }
   void clientWantsNothingMore() {
-    zelkor::KeyValueMessage message;
-    message.set(zelkor::kKeyAppID, std::int64_t{2});
-    ASSERT_EQ(perform(zelkor::kCommandClearConfiguration, message), 0);
+    ASSERT_EQ(perform(zelkor::kCommandClearConfiguration, test::clearConfiguration()), 0);
   }
   void clientAsks() {
-    zelkor::KeyValueMessage message;
-    message.set(zelkor::kKeyAppID, std::int64_t{2});
-    message.set(zelkor::kKeyPayloadType, std::int64_t{0});
-    message.set(zelkor::kKeyTriggerRef, std::int64_t{9999});
-    message.set(zelkor::kKeyTriggerType, std::int64_t{0});
-    message.set(zelkor::kKeyTriggerID, std::int64_t{5202011});
-    message.set(zelkor::kKeyProfileID, std::int64_t{0});
-    message.set(zelkor::kKeyMetricID, std::int64_t{0});
-    ASSERT_EQ(perform(zelkor::kCommandQueryMetric, message), 0);
+    ASSERT_EQ(perform(zelkor::kCommandQueryMetric, test::queryMetric()), 0);
     time.settle();
   }
   void driveOn(seconds duration) {

@@ -1,5 +1,3 @@
-#include <clocale>
-#include <cstdlib>
 #include <filesystem>
 #include <string>
 
@@ -7,27 +5,20 @@
 
 #include "hosts/simulator/PhoneServices.h"
 #include "store/DefaultDashboard.h"
+#include "support/TimeZone.h"
 
 namespace quorl::test {
 namespace {
 
-/// A person who reads `language`. The plain locale with UTF-8 is on every system and takes any language.
+/// A person who reads `language`.
 class Reader {
  public:
-  explicit Reader(const char* language) {
-    setenv("LANGUAGE", language, 1);
-    std::setlocale(LC_MESSAGES, "C.UTF-8");
-  }
-  ~Reader() {
-    unsetenv("LANGUAGE");
-    std::setlocale(LC_MESSAGES, "C");
-  }
-  Reader(const Reader&) = delete;
-  Reader& operator=(const Reader&) = delete;
+  explicit Reader(const char* language) : language_(language) {}
 
   std::string sees(const std::string& name) { return strings_.localized(name); }
 
  private:
+  const ScopedLanguage language_;
   simulator::GettextStrings strings_{{std::filesystem::path(QUORL_BINARY_DIR) / "share" / "quorl"}};
 };
 

@@ -16,6 +16,7 @@
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
 #include "support/LogRecorder.h"
+#include "support/Reading.h"
 #include "support/TimeZone.h"
 #include "support/VirtualTimeVfs.h"
 
@@ -101,18 +102,8 @@ class DatabaseFixture : public testing::Test {
   /// A reading of the serving cell; tests change what matters to them.
   static Metric reading(std::string attribute = "dl_freq", std::string value = "5230",
                         std::string_view collectedOn = "2026-01-05 09:00:00", std::int32_t subsId = 0) {
-    Metric metric;
-    metric.id = Uuid::make();
-    metric.metricTech = "LTE";
-    metric.metricName = "Serving Cell Info";
-    metric.attributeName = std::move(attribute);
-    metric.attributeNameNonLocalized = metric.attributeName;
-    metric.attributeValue = std::move(value);
-    metric.attributeValueType = "INT";
-    metric.collectedOn = parseWallClock(collectedOn).value();
-    metric.metricId = "803010";
-    metric.subsId = subsId;
-    return metric;
+    return readingAt(parseWallClock(collectedOn).value(), "LTE", "Serving Cell Info", std::move(attribute),
+                     std::move(value), subsId);
   }
 
   Written createTable(const std::string& sql, const std::string& name) {

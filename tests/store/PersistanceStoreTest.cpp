@@ -12,6 +12,7 @@
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
 #include "support/LogRecorder.h"
+#include "support/Reading.h"
 #include "support/TimeZone.h"
 #include "support/VirtualTimeVfs.h"
 
@@ -68,15 +69,7 @@ class PersistanceStoreTest : public testing::Test {
   }
 
   static Metric metricOfValue(std::string value) {
-    Metric metric;
-    metric.metricTech = "LTE";
-    metric.metricName = "Serving Cell Info";
-    metric.attributeName = "dl_freq";
-    metric.attributeValue = std::move(value);
-    metric.attributeValueType = "INT";
-    metric.collectedOn = Platform::current().clock.now();
-    metric.metricId = "803010";
-    return metric;
+    return test::readingAt(Platform::current().clock.now(), "LTE", "Serving Cell Info", "dl_freq", std::move(value));
   }
   static void post(const char* name, std::string value) {
     NotificationCenter::defaultCenter().post(

@@ -7,6 +7,7 @@
 #include "store/DBManager.h"
 #include "store/MetricStatements.h"
 #include "support/FakePlatform.h"
+#include "support/Reading.h"
 #include "support/TimeZone.h"
 #include "support/VirtualTimeVfs.h"
 
@@ -48,15 +49,8 @@ class StoreThreadsTest : public testing::Test {
   }
 
   Metric reading(int value) const {
-    Metric metric;
-    metric.metricTech = "LTE";
-    metric.metricName = "Serving Cell Info";
-    metric.attributeName = "attribute_" + std::to_string(value % 7);
-    metric.attributeValue = std::to_string(value);
-    metric.attributeValueType = "INT";
-    metric.collectedOn = fake.time.now() + std::chrono::seconds(value);
-    metric.metricId = "803010";
-    return metric;
+    return test::readingAt(fake.time.now() + std::chrono::seconds(value), "LTE", "Serving Cell Info",
+                           "attribute_" + std::to_string(value % 7), std::to_string(value));
   }
 
   test::FakePlatform fake;

@@ -29,7 +29,8 @@ std::optional<std::filesystem::path> FakeResources::path(std::string_view name, 
 
 std::string FakeStrings::localized(std::string_view key) {
   const auto found = table.find(key);
-  return found == table.end() ? std::string(key) : found->second;
+  if (found != table.end()) return found->second;
+  return rest != nullptr ? rest->localized(key) : std::string(key);
 }
 
 void FakeAnalytics::send(std::string_view event, const Payload& payload) {

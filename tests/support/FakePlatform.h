@@ -40,6 +40,7 @@ struct FakeDocuments final : DocumentsDirectory {
 struct FakeStrings final : StringTable {
   std::string localized(std::string_view key) override;
   std::map<std::string, std::string, std::less<>> table;
+  StringTable* rest = nullptr;  // answers for what is not in the table
 };
 
 struct FakeConsole final : Console {

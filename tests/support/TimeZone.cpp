@@ -1,5 +1,6 @@
 #include "support/TimeZone.h"
 
+#include <clocale>
 #include <cstdlib>
 #include <ctime>
 
@@ -30,6 +31,16 @@ ScopedLocale::ScopedLocale(std::string_view name) : previous_(icu::Locale::getDe
 ScopedLocale::~ScopedLocale() {
   UErrorCode status = U_ZERO_ERROR;
   icu::Locale::setDefault(icu::Locale(previous_.c_str()), status);
+}
+
+ScopedLanguage::ScopedLanguage(const char* language) {
+  setenv("LANGUAGE", language, 1);
+  std::setlocale(LC_MESSAGES, "C.UTF-8");
+}
+
+ScopedLanguage::~ScopedLanguage() {
+  unsetenv("LANGUAGE");
+  std::setlocale(LC_MESSAGES, "C");
 }
 
 }  // namespace quorl::test

@@ -30,4 +30,14 @@ class ScopedLocale {
   std::string previous_;
 };
 
+/// A person who reads `language`, to gettext, while it lives. The plain locale with UTF-8 is on every system and takes
+/// any language.
+class ScopedLanguage {
+ public:
+  explicit ScopedLanguage(const char* language);
+  ~ScopedLanguage();
+  ScopedLanguage(const ScopedLanguage&) = delete;
+  ScopedLanguage& operator=(const ScopedLanguage&) = delete;
+};
+
 }  // namespace quorl::test

@@ -15,6 +15,7 @@
 #include "shell/RootNavigationController.h"
 #include "shell/Window.h"
 #include "store/MetricStatements.h"
+#include "support/Reading.h"
 
 namespace quorl::test {
 
@@ -30,18 +31,8 @@ ScreenWindowTest::~ScreenWindowTest() {
 
 Metric ScreenWindowTest::reading(std::string metricTech, std::string metricName, std::string attributeName,
                                  std::string value, std::int32_t subsId) const {
-  Metric metric;
-  metric.id = Uuid::make();
-  metric.metricTech = std::move(metricTech);
-  metric.metricName = std::move(metricName);
-  metric.attributeName = attributeName;
-  metric.attributeNameNonLocalized = std::move(attributeName);
-  metric.attributeValue = std::move(value);
-  metric.attributeValueType = "INT";
-  metric.collectedOn = phone.time.now();
-  metric.metricId = "803010";
-  metric.subsId = subsId;
-  return metric;
+  return readingAt(phone.time.now(), std::move(metricTech), std::move(metricName), std::move(attributeName),
+                   std::move(value), subsId);
 }
 
 std::shared_ptr<sqlite3> ScreenWindowTest::openFile() const {

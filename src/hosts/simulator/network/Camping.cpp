@@ -6,6 +6,8 @@
 namespace quorl::simulator::network {
 namespace {
 
+using Kind = event::AirMessageKind;
+
 constexpr std::array kByPreference{Technology::Nr, Technology::Lte, Technology::Umts, Technology::Gsm};
 /// Home is looked for again this long after another network was taken.
 constexpr SimulatedMs kHomeSearchMs = 120000;
@@ -130,7 +132,6 @@ void Camping::camp(const Cell& cell, event::ChangeReason reason) {
 }
 
 void Camping::readSystemInformation(const Cell& cell) {
-  using Kind = event::AirMessageKind;
   core_.say(&cell, Kind::Mib, false, 0, 3);
   core_.say(&cell, Kind::Sib1, false, 0, static_cast<std::uint16_t>(18 + core_.random.below(60)));
   core_.say(&cell, Kind::SystemInformation, false, 0, static_cast<std::uint16_t>(30 + core_.random.below(90)));
