@@ -230,7 +230,7 @@ constexpr MetricKind kLteMetrics[] = {
      /*isCurrent=*/true,
      {30000, 600}},
     {803011, on<event::AirMessage>(), lteOtaMsg},
-    {803104, on<event::RachAttempt>(), rachAttempt},
+    {803104, on<event::RachAttempt>(), lteRachAttempt},
     {806674, on<event::Measured>(), stateHistory, /*isCurrent=*/true, {120000, 60000}, /*counts=*/true},
     {806660, on<event::Measured>(), levelHistogram, /*isCurrent=*/true, {20000, 200}, /*counts=*/true},
     {806743, on<event::ConnectionEnded>(), lteConnectionStats},

@@ -173,7 +173,7 @@ constexpr MetricKind kNrCellMetrics[] = {
      nrServingCell,
      /*isCurrent=*/true,
      {30000, 600}},
-    {806915, on<event::RachAttempt>(), rachAttempt},
+    {806915, on<event::RachAttempt>(), nrRachAttempt},
     {806922, on<event::BeamSwitched>(), beamSwitch},
 };
 
