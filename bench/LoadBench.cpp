@@ -22,6 +22,7 @@
 #include <vector>
 
 #include <fmt/format.h>
+#include <malloc.h>
 #include <sqlite3.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -296,6 +297,12 @@ double megabytes(std::string_view field) {
   return static_cast<double>(bench::memory(field)) / 1e6;
 }
 
+/// What the process has asked for and not given back, of what the allocator holds for it, in megabytes.
+double inUse() {
+  const struct mallinfo2 heap = mallinfo2();
+  return static_cast<double>(heap.uordblks + heap.hblkhd) / 1e6;
+}
+
 [[noreturn]] void run(const std::string& name, milliseconds length) {
   auto scenario = simulator::findScenario(name, {kResources});
   if (!scenario) {
@@ -326,8 +333,8 @@ double megabytes(std::string_view field) {
   site.settle();
 
   fmt::print("{}, {} simulated minutes\n", name, length.count() / 60000);
-  fmt::print("{:>7} {:>9} {:>10} {:>8} {:>12} {:>12} {:>22} {:>10}\n", "hour", "events", "rows", "RSS MB",
-             "main deepest", "db deepest", "main hold ms (cpu)", "> 100 ms");
+  fmt::print("{:>7} {:>9} {:>10} {:>8} {:>9} {:>12} {:>12} {:>22} {:>10}\n", "hour", "events", "rows", "RSS MB",
+             "in use MB", "main deepest", "db deepest", "main hold ms (cpu)", "> 100 ms");
   const auto begun = Steady::now();
   const milliseconds section = std::min<milliseconds>(length, 1h);
   double longestSecondMs = 0;
@@ -353,8 +360,8 @@ double megabytes(std::string_view field) {
     longHolds += main.longHolds;
     longestMs = std::max(longestMs, main.longestMs);
     longestOwnMs = std::max(longestOwnMs, main.longestOwnMs);
-    fmt::print("{:>7.2f} {:>9} {:>10} {:>8.1f} {:>12} {:>12} {:>13.1f} ({:>6.1f}) {:>10}\n",
-               static_cast<double>(passed.count()) / 3.6e6, (*live)->events(), announced, megabytes("VmRSS:"),
+    fmt::print("{:>7.2f} {:>9} {:>10} {:>8.1f} {:>9.1f} {:>12} {:>12} {:>13.1f} ({:>6.1f}) {:>10}\n",
+               static_cast<double>(passed.count()) / 3.6e6, (*live)->events(), announced, megabytes("VmRSS:"), inUse(),
                main.deepest, database.deepest, main.longestMs, main.longestOwnMs, main.longHolds);
     std::fflush(stdout);
   }
