@@ -29,7 +29,7 @@ namespace {
 
 using simulator::SimulatedPhone;
 
-struct Options {
+struct CarriersOptions {
   simulator::DeviceDescription device;
   std::string chipset = "mav20";
   std::string documents;  // empty: a directory that goes with the process
@@ -123,7 +123,7 @@ bool press(const CarrierBar& bar, SimulatedPhone& phone, const std::vector<std::
   return true;
 }
 
-int showCarriers(const Options& options) {
+int showCarriers(const CarriersOptions& options) {
   std::size_t faults = 0;
   auto steps = readScript(options.telephonyScript, faults);
   if (!steps) return kFailure;
@@ -136,7 +136,7 @@ int showCarriers(const Options& options) {
   // As the product, they live until the process ends.
   const auto log = ToolLog::install(options.isVerbose);
   SimulatedPhone::Options description{options.device, documents.path(),
-                                      simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)};
+                                              simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)};
   description.isConsoleShown = options.isVerbose;
   static auto* phone = new SimulatedPhone(std::move(description));
   static const auto* bar = new CarrierBar;
@@ -160,7 +160,7 @@ void addCarriers(CommandLine& tool) {
   command.setFooter(
       "Starts the product on a simulated phone, plays the script, and shows the record of each slot, the tabs of the\n"
       "carrier bar, and the subscription that the screens show. Without --documents nothing is kept.");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<CarriersOptions>();
   command.addOption("--telephony", options->telephonyScript, "Telephony script to play").required();
   command.addOption("--until-ms", options->untilMs, "Stop after the events of this time; all of them if left out")
       .notNegative();

@@ -17,7 +17,7 @@
 namespace quorl::tool {
 namespace {
 
-struct Options {
+struct ExportOptions {
   StoreOptions store;
   std::string timeFrame;
   std::string output;  // empty: standard output
@@ -44,7 +44,7 @@ int writeFile(const std::string& path, std::string_view text) {
   return kFailure;
 }
 
-int exportRows(StoreSession& session, const Options& options) {
+int exportRows(StoreSession& session, const ExportOptions& options) {
   const auto screen = ExportViewController::make(session.store());
   for (ExportView& row : screen->containerView())
     if (row.timeFrame() == timeFrameNamed(options.timeFrame)) row.didTapExportButton();
@@ -65,7 +65,7 @@ void addExport(CommandLine& tool) {
   Command command =
       tool.addCommand("export", "Print all stored rows of a time frame, as the export screen shares them");
   command.setFooter("The text has no line break, not even at its end, and mixes both subscriptions.");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<ExportOptions>();
   addTimeFrameOption(command, options->timeFrame);
   command.addOption("--output", options->output, "File to write to instead of standard output");
   addStoreOptions(command, options->store, /*isTable=*/false);

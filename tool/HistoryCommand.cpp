@@ -19,7 +19,7 @@
 namespace quorl::tool {
 namespace {
 
-struct Options {
+struct HistoryOptions {
   StoreOptions store;
   std::string metric;
   std::string attribute;
@@ -71,7 +71,7 @@ void printJson(const AttributeDetailsView& view) {
     std::cout << jsonLine({{"collectedOn", wallClockText(row.collectedOn)}, {"value", row.attributeValue}}) << '\n';
 }
 
-int showHistory(StoreSession& session, const Options& options) {
+int showHistory(StoreSession& session, const HistoryOptions& options) {
   Metric metric;
   metric.metricName = options.metric;
   metric.attributeName = metric.attributeNameNonLocalized = options.attribute;
@@ -102,7 +102,7 @@ void addHistory(CommandLine& tool) {
   command.setFooter(
       "daily: the readings of today, of one subscription. weekly, monthly: an average for each day, of both\n"
       "subscriptions together. On a terminal each line has a bar.");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<HistoryOptions>();
   command.addOption("--metric", options->metric, "Metric, such as \"Cell Info\"").required();
   command.addOption("--attribute", options->attribute, "Attribute as stored, such as kHVCellMonitorCellId").required();
   addTimeFrameOption(command, options->timeFrame);

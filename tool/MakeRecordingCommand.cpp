@@ -11,13 +11,13 @@
 namespace quorl::tool {
 namespace {
 
-struct Options {
+struct MakeRecordingOptions {
   std::string family;
   std::string output;
   std::uint64_t seed = 1;
 };
 
-int writeRecording(const Options& options) {
+int writeRecording(const MakeRecordingOptions& options) {
   std::ofstream output(options.output, std::ios::binary);
   const BasebandFamily family = options.family == "ice" ? BasebandFamily::Ice : BasebandFamily::Mav;
   for (const simulator::RecordedEvent& event : makeRecording(family, options.seed))
@@ -34,7 +34,7 @@ void addMakeRecording(CommandLine& tool) {
   command.setFooter(
       "The recordings that ship with the project are made by it. The same seed gives the same recording.");
   command.hide();  // of no use but to the project itself
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<MakeRecordingOptions>();
   command.addOption("--family", options->family, "Baseband family").required().oneOf({"mav", "ice"});
   command.addOption("--seed", options->seed, "Where the invention starts").showDefault();
   command.addOption("--output", options->output, "File to write").required();

@@ -14,14 +14,14 @@
 namespace quorl::tool {
 namespace {
 
-struct Options {
+struct PinOptions {
   StoreOptions store;
   std::string tech;
   std::string metric;
   std::string attribute;
 };
 
-int complainOfAttribute(const std::vector<Metric>& rows, const Options& options) {
+int complainOfAttribute(const std::vector<Metric>& rows, const PinOptions& options) {
   std::string text = fmt::format("there is no attribute \"{}\" of {} \"{}\" for subscription {}", options.attribute,
                                  options.tech, options.metric, options.store.subscription);
   std::vector<std::string_view> names;
@@ -45,7 +45,7 @@ bool isPinned(StoreSession& session, const Metric& row) {
   return isFound;
 }
 
-int pin(StoreSession& session, const Options& options) {
+int pin(StoreSession& session, const PinOptions& options) {
   const auto model = MetricDetailViewModel::make(session.store(), options.tech, options.metric,
                                                  options.store.subscription, SystemClock().now());
   session.settle();
@@ -66,7 +66,7 @@ int pin(StoreSession& session, const Options& options) {
 
 void addPin(CommandLine& tool) {
   Command command = tool.addCommand("pin", "Put an attribute on the dashboard");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<PinOptions>();
   command.addOption("--tech", options->tech, "Technology, such as LTE").required();
   command.addOption("--metric", options->metric, "Metric, such as \"Serving Cell Info\"").required();
   command.addOption("--attribute", options->attribute, "Attribute as stored, such as dl_freq").required();

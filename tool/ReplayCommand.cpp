@@ -33,7 +33,7 @@ namespace {
 using simulator::RecordedEvent;
 using simulator::SimulatedPhone;
 
-struct Options {
+struct ReplayOptions {
   simulator::DeviceDescription device;
   std::string chipset;
   std::string deviceClass;
@@ -101,7 +101,7 @@ void print(const Summary& summary) {
             << '\n';
 }
 
-int replay(const Options& options) {
+int replay(const ReplayOptions& options) {
   std::size_t faults = 0;
   auto events = readAll(options.files, faults);
   if (!events) return kFailure;
@@ -147,7 +147,7 @@ void addReplay(CommandLine& tool) {
       "summary. The rows are then in metricPartV11.sqlite in the documents directory. A line of a recording that is "
       "no\n"
       "event is reported and left out, and makes the exit code 1.");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<ReplayOptions>();
   command.addOption("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")
       .required();
   command.addOption("--documents", options->documents, "Directory for the database; made if it is missing").required();

@@ -14,7 +14,7 @@
 namespace quorl::tool {
 namespace {
 
-struct Options {
+struct ShowOptions {
   StoreOptions store;
   std::string tech;
   std::string metric;
@@ -50,7 +50,7 @@ void printJson(MetricDetailView& view) {
   }
 }
 
-int show(StoreSession& session, const Options& options) {
+int show(StoreSession& session, const ShowOptions& options) {
   const auto screen = MetricDetailsViewController::make(session.store(), options.tech, options.metric,
                                                         options.store.subscription, SystemClock().now());
   screen->viewDidLoad();
@@ -70,7 +70,7 @@ void addShow(CommandLine& tool) {
   Command command = tool.addCommand("show", "Print the latest value of each attribute of a metric");
   command.setFooter(
       "Names and values are those that the detail screen shows; --json has the stored names beside them.");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<ShowOptions>();
   command.addOption("--tech", options->tech, "Technology, such as LTE").required();
   command.addOption("--metric", options->metric, "Metric, such as \"Serving Cell Info\"").required();
   addStoreOptions(command, options->store, /*isTable=*/true);

@@ -25,7 +25,7 @@ namespace {
 
 using simulator::ScenarioChoice;
 
-struct Options {
+struct SimulateOptions {
   std::string scenario;
   std::string family = "mav";
   std::string output;
@@ -42,7 +42,7 @@ struct Options {
 };
 
 /// Why the options do not fit together; empty if they do.
-std::string contradiction(const Options& options) {
+std::string contradiction(const SimulateOptions& options) {
   if (options.output.empty() == options.documents.empty()) return "one of --output and --documents is needed";
   if (!options.output.empty() && options.historyDays > 0) return "--history-days needs --documents";
   if (!options.output.empty() && !options.record.empty()) return "--record needs --documents; --output is a recording";
@@ -51,16 +51,16 @@ std::string contradiction(const Options& options) {
   return {};
 }
 
-std::optional<Date> startOf(const Options& options) {
+std::optional<Date> startOf(const SimulateOptions& options) {
   constexpr std::chrono::seconds kUsual{1767605400};  // 2026-01-05 09:30:00 UTC
   return options.start.empty() ? Date(kUsual) : parseWallClock(options.start);
 }
 
-std::chrono::milliseconds lengthOf(const Options& options) {
+std::chrono::milliseconds lengthOf(const SimulateOptions& options) {
   return std::chrono::milliseconds(std::llround(options.minutes * 60000));
 }
 
-simulator::HistoryPlan historyOf(const Options& options, const ScenarioChoice& choice, Date until) {
+simulator::HistoryPlan historyOf(const SimulateOptions& options, const ScenarioChoice& choice, Date until) {
   const auto session = std::chrono::duration<double, std::ratio<60>>(options.sessionMinutes);
   return {choice, options.historyDays, until, options.sessionsPerDay,
           std::chrono::duration_cast<std::chrono::milliseconds>(session)};
@@ -75,7 +75,7 @@ double rounded(double value) {
   return std::round(value * 1000) / 1000;
 }
 
-int writeRecording(const Options& options, ScenarioChoice choice) {
+int writeRecording(const SimulateOptions& options, ScenarioChoice choice) {
   const auto start = startOf(options);
   if (!start) return fail(fmt::format("{} is no time of the form yyyy-MM-dd HH:mm:ss", options.start));
   ProgressBar bar;
@@ -86,7 +86,7 @@ int writeRecording(const Options& options, ScenarioChoice choice) {
   return kSuccess;
 }
 
-int fillDocuments(const Options& options, const ScenarioChoice& choice) {
+int fillDocuments(const SimulateOptions& options, const ScenarioChoice& choice) {
   if (const auto prepared = prepareDocuments(options.documents); !prepared) return fail(prepared.error());
   const Date until = SystemClock().now();
   SimulatedProduct product(options.family, options.documents);
@@ -121,7 +121,7 @@ int fillDocuments(const Options& options, const ScenarioChoice& choice) {
   return lived->insertsFailed == 0 ? kSuccess : kFailure;
 }
 
-int simulate(const Options& options) {
+int simulate(const SimulateOptions& options) {
   if (const std::string why = contradiction(options); !why.empty()) {
     complain(why + " (see quorl-tool simulate --help)");
     return kWrongUse;
@@ -147,7 +147,7 @@ void addSimulate(CommandLine& tool) {
       "which the product was looked at some times a day, written in bulk; with --minutes what the product itself "
       "makes\n"
       "of the way. The same scenario, seed and family give the same recording, byte for byte.");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<SimulateOptions>();
   command.addOption("--scenario", options->scenario, "Name of a scenario that ships with it, or a file").required();
   command.addOption("--seed", options->seed, "Which of the scenario's runs").showDefault();
   command.addOption("--family", options->family, "Baseband family").oneOf({"mav", "ice"}).showDefault();

@@ -12,7 +12,7 @@
 namespace quorl::tool {
 namespace {
 
-struct Options {
+struct SummaryOptions {
   std::string documents;
   bool asJson = false;
 };
@@ -44,7 +44,7 @@ void printJson(const std::vector<MetricSummary>& metrics) {
               << '\n';
 }
 
-int printSummary(const Options& options) {
+int printSummary(const SummaryOptions& options) {
   const auto metrics = summarize(options.documents);
   if (!metrics) {
     complain(metrics.error());
@@ -59,7 +59,7 @@ int printSummary(const Options& options) {
 void addSummary(CommandLine& tool) {
   Command command = tool.addCommand("summary", "Print what a database holds, metric by metric");
   command.setFooter("One line for each metric: technology, metric, rows, and the time of the latest row.");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<SummaryOptions>();
   command.addOption("--documents", options->documents, "Documents directory that replay filled").required();
   command.addFlag("--json", options->asJson, "Print one JSON object a line instead of a table");
   command.setAction([options] { return printSummary(*options); });

@@ -14,7 +14,7 @@
 namespace quorl::tool {
 namespace {
 
-struct Options {
+struct UnpinOptions {
   StoreOptions store;
   std::string tech;
   std::string attribute;
@@ -30,7 +30,7 @@ std::optional<std::vector<DashboardTableItem>> pins(StoreSession& session, std::
   return answer;
 }
 
-int unpin(StoreSession& session, const Options& options) {
+int unpin(StoreSession& session, const UnpinOptions& options) {
   auto items = pins(session, options.store.subscription);
   if (!items) {
     complain("the dashboard cannot be read (see --verbose)");
@@ -56,7 +56,7 @@ int unpin(StoreSession& session, const Options& options) {
 
 void addUnpin(CommandLine& tool) {
   Command command = tool.addCommand("unpin", "Take an attribute off the dashboard");
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<UnpinOptions>();
   command.addOption("--tech", options->tech, "Technology, such as LTE").required();
   command.addOption("--attribute", options->attribute, "Attribute as stored, such as dl_freq").required();
   addStoreOptions(command, options->store, /*isTable=*/false);

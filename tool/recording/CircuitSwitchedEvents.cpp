@@ -134,7 +134,7 @@ ByteString pageFailure(RadioWorld& world) {
   return payload(message);
 }
 
-constexpr EventKind kKinds[] = {
+constexpr EventKind kCircuitSwitchedEvents[] = {
     {790530, kSeldomMs, cdmaCell}, {798732, kNowAndThenMs, gsmWcdmaCell}, {802306, kNowAndThenMs, wcdmaState},
     {835590, kSeldomMs, callEnd},  {835592, kSeldomMs, pageFailure},
 };
@@ -142,7 +142,7 @@ constexpr EventKind kKinds[] = {
 }  // namespace
 
 std::span<const EventKind> circuitSwitchedKinds() {
-  return kKinds;
+  return kCircuitSwitchedEvents;
 }
 
 }  // namespace quorl::tool

@@ -141,7 +141,7 @@ ByteString gsmCell(RadioWorld& world) {
   return payload(message);
 }
 
-constexpr EventKind kKinds[] = {
+constexpr EventKind kIceCircuitSwitchedEvents[] = {
     {3985682, kOftenMs, umtsState},           {3985683, kNowAndThenMs, umtsConfiguration},
     {3944460, kNowAndThenMs, umtsCell},       {3985666, kOftenMs, umtsMeasurement},
     {3985667, kNowAndThenMs, umtsPower},      {3985668, kNowAndThenMs, umtsReselection},
@@ -151,7 +151,7 @@ constexpr EventKind kKinds[] = {
 }  // namespace
 
 std::span<const EventKind> iceCircuitSwitchedKinds() {
-  return kKinds;
+  return kIceCircuitSwitchedEvents;
 }
 
 }  // namespace quorl::tool

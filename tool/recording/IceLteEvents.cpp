@@ -9,7 +9,7 @@
 namespace quorl::tool {
 namespace {
 
-ByteString rrcState(RadioWorld& world) {
+ByteString iceLteRrcState(RadioWorld& world) {
   using State = KCellularLteRrcState;
   State message;
   setCommon(message, world);
@@ -21,7 +21,7 @@ ByteString rrcState(RadioWorld& world) {
   return payload(message);
 }
 
-ByteString servingCell(RadioWorld& world) {
+ByteString iceLteServingCell(RadioWorld& world) {
   KCellularLteScellInfo message;
   setCommon(message, world);
   setLteServingCell(message, world, world.lte().resourceBlocks * 2);
@@ -238,17 +238,23 @@ ByteString neighbours(RadioWorld& world) {
   return payload(message);
 }
 
-constexpr EventKind kKinds[] = {
-    {3952132, kOftenMs, rrcState},      {3948738, kOftenMs, servingCell}, {3986177, kOftenMs, measurement},
-    {3986195, kOftenMs, aggregation},   {3952152, kNowAndThenMs, cdrx},   {3986190, kNowAndThenMs, reselection},
-    {3986187, kNowAndThenMs, carriers}, {3986178, kOftenMs, txPower},     {3986192, kNowAndThenMs, otherTechnologies},
+constexpr EventKind kIceLteEvents[] = {
+    {3952132, kOftenMs, iceLteRrcState},
+    {3948738, kOftenMs, iceLteServingCell},
+    {3986177, kOftenMs, measurement},
+    {3986195, kOftenMs, aggregation},
+    {3952152, kNowAndThenMs, cdrx},
+    {3986190, kNowAndThenMs, reselection},
+    {3986187, kNowAndThenMs, carriers},
+    {3986178, kOftenMs, txPower},
+    {3986192, kNowAndThenMs, otherTechnologies},
     {3986191, kOftenMs, neighbours},
 };
 
 }  // namespace
 
 std::span<const EventKind> iceLteKinds() {
-  return kKinds;
+  return kIceLteEvents;
 }
 
 }  // namespace quorl::tool

@@ -106,7 +106,7 @@ ByteString simFiles(RadioWorld& world) {
   return payload(message);
 }
 
-constexpr EventKind kKinds[] = {
+constexpr EventKind kIceNasEvents[] = {
     {3986700, kOftenMs, epsContext}, {3986698, kNowAndThenMs, circuitContext}, {3986699, kNowAndThenMs, packetContext},
     {3986701, kOftenMs, bearers},    {3932179, kSeldomMs, simFiles},
 };
@@ -114,7 +114,7 @@ constexpr EventKind kKinds[] = {
 }  // namespace
 
 std::span<const EventKind> iceNasKinds() {
-  return kKinds;
+  return kIceNasEvents;
 }
 
 }  // namespace quorl::tool

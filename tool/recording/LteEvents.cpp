@@ -11,7 +11,7 @@
 namespace quorl::tool {
 namespace {
 
-ByteString servingCell(RadioWorld& world) {
+ByteString lteServingCell(RadioWorld& world) {
   CellularLteScellInfo message;
   setCommon(message, world);
   setLteServingCell(message, world, world.lte().resourceBlocks);
@@ -20,7 +20,7 @@ ByteString servingCell(RadioWorld& world) {
   return payload(message);
 }
 
-ByteString otaMsg(RadioWorld& world) {
+ByteString lteOtaMsg(RadioWorld& world) {
   using Message = CellularLteOtaMsg;
   Message message;
   setCommon(message, world);
@@ -51,7 +51,7 @@ ByteString otaMsg(RadioWorld& world) {
   return payload(message);
 }
 
-ByteString rachAttempt(RadioWorld& world) {
+ByteString lteRachAttempt(RadioWorld& world) {
   using Attempt = CellularLteRachAttempt;
   Attempt message;
   setCommon(message, world);
@@ -120,7 +120,7 @@ MessageRef<BandCombo> combo(RadioWorld& world, std::uint32_t components) {
   return made;
 }
 
-ByteString connectionStats(RadioWorld& world) {
+ByteString lteConnectionStats(RadioWorld& world) {
   using Stats = CellularLteConnectionStats;
   Stats message;
   setCommon(message, world);
@@ -147,16 +147,16 @@ ByteString connectionStats(RadioWorld& world) {
   return payload(message);
 }
 
-constexpr EventKind kKinds[] = {
-    {803010, kOftenMs, servingCell},         {803011, kOftenMs, otaMsg},
-    {803104, kNowAndThenMs, rachAttempt},    {806674, kNowAndThenMs, stateHistory},
-    {806660, kNowAndThenMs, levelHistogram}, {806743, kNowAndThenMs, connectionStats},
+constexpr EventKind kLteEvents[] = {
+    {803010, kOftenMs, lteServingCell},      {803011, kOftenMs, lteOtaMsg},
+    {803104, kNowAndThenMs, lteRachAttempt}, {806674, kNowAndThenMs, stateHistory},
+    {806660, kNowAndThenMs, levelHistogram}, {806743, kNowAndThenMs, lteConnectionStats},
 };
 
 }  // namespace
 
 std::span<const EventKind> lteKinds() {
-  return kKinds;
+  return kLteEvents;
 }
 
 }  // namespace quorl::tool

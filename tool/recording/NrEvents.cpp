@@ -36,7 +36,7 @@ ByteString sysInfoBlocks(RadioWorld& world) {
   return payload(message);
 }
 
-ByteString otaMsg(RadioWorld& world) {
+ByteString nrOtaMsg(RadioWorld& world) {
   CellularNrOtaMsg message;
   setCommon(message, world);
   setNetwork(message, world);
@@ -65,7 +65,7 @@ ByteString otaMsg(RadioWorld& world) {
   return payload(message);
 }
 
-ByteString servingCell(RadioWorld& world) {
+ByteString nrServingCell(RadioWorld& world) {
   CellularNrScellInfo message;
   setCommon(message, world);
   setNetwork(message, world);
@@ -97,7 +97,7 @@ MessageRef<ServingCellBeamInfo> beam(RadioWorld& world, const NrCell& cell) {
   return info;
 }
 
-ByteString rachAttempt(RadioWorld& world) {
+ByteString nrRachAttempt(RadioWorld& world) {
   CellularNrRachAttempt message;
   setCommon(message, world);
   const NrCell& cell = world.nr();
@@ -120,7 +120,7 @@ ByteString rachAttempt(RadioWorld& world) {
   return payload(message);
 }
 
-ByteString rrcState(RadioWorld& world) {
+ByteString nrRrcState(RadioWorld& world) {
   CellularNrRrcState message;
   setCommon(message, world);
   message.setState(world.count(0, 2));
@@ -258,7 +258,7 @@ MessageRef<BandCombo> nrCombo(RadioWorld& world) {
   return combo;
 }
 
-ByteString connectionStats(RadioWorld& world) {
+ByteString nrConnectionStats(RadioWorld& world) {
   using Stats = CellularNrConnectionStats;
   Stats message;
   setCommon(message, world);
@@ -304,18 +304,18 @@ ByteString sdmRelease(RadioWorld& world) {
   return payload(message);
 }
 
-constexpr EventKind kKinds[] = {
-    {806912, kSeldomMs, sysInfoBlocks},    {806913, kOftenMs, otaMsg},          {806914, kOftenMs, servingCell},
-    {806915, kNowAndThenMs, rachAttempt},  {806917, kOftenMs, rrcState},        {806919, kNowAndThenMs, scgAddition},
-    {806920, kNowAndThenMs, scgRemoval},   {806922, kNowAndThenMs, beamSwitch}, {806928, kNowAndThenMs, rrcResume},
-    {806931, kSeldomMs, radioLinkFailure}, {806932, kNowAndThenMs, uplinkPdcp}, {806933, kNowAndThenMs, endcUsage},
-    {806934, kOftenMs, connectionStats},   {806936, kSeldomMs, sdmActivation},  {806937, kSeldomMs, sdmRelease},
+constexpr EventKind kNrEvents[] = {
+    {806912, kSeldomMs, sysInfoBlocks},     {806913, kOftenMs, nrOtaMsg},        {806914, kOftenMs, nrServingCell},
+    {806915, kNowAndThenMs, nrRachAttempt}, {806917, kOftenMs, nrRrcState},      {806919, kNowAndThenMs, scgAddition},
+    {806920, kNowAndThenMs, scgRemoval},    {806922, kNowAndThenMs, beamSwitch}, {806928, kNowAndThenMs, rrcResume},
+    {806931, kSeldomMs, radioLinkFailure},  {806932, kNowAndThenMs, uplinkPdcp}, {806933, kNowAndThenMs, endcUsage},
+    {806934, kOftenMs, nrConnectionStats},  {806936, kSeldomMs, sdmActivation},  {806937, kSeldomMs, sdmRelease},
 };
 
 }  // namespace
 
 std::span<const EventKind> nrKinds() {
-  return kKinds;
+  return kNrEvents;
 }
 
 }  // namespace quorl::tool

@@ -211,7 +211,7 @@ ByteString tunerEvent(RadioWorld& world) {
   return payload(message);
 }
 
-constexpr EventKind kKinds[] = {
+constexpr EventKind kServiceEvents[] = {
     {827656, kNowAndThenMs, linkQuality},   {827652, kSeldomMs, regAttempt},        {827650, kSeldomMs, registeredPlmn},
     {827746, kNowAndThenMs, ratLacService}, {827747, kNowAndThenMs, ratLacService}, {816135, kSeldomMs, health},
     {827683, kSeldomMs, dataStall},         {827648, kNowAndThenMs, serviceStatus}, {827649, kSeldomMs, operatingMode},
@@ -221,7 +221,7 @@ constexpr EventKind kKinds[] = {
 }  // namespace
 
 std::span<const EventKind> serviceKinds() {
-  return kKinds;
+  return kServiceEvents;
 }
 
 }  // namespace quorl::tool
