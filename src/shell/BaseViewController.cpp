@@ -6,7 +6,6 @@
 #include "store/PersistanceStore.h"
 
 namespace quorl {
-namespace {
 
 const char* titleOf(BaseViewNavigationIndexes index) {
   switch (index) {
@@ -20,22 +19,13 @@ const char* titleOf(BaseViewNavigationIndexes index) {
   fatalStop("BaseViewNavigationIndexes: no such case");
 }
 
-int numberOfSegments(const HardwareManager& hardware) {
-  const bool hasThird = (hardware.isInternalBuild() || hardware.isCarrierBuild()) && hardware.isMavDevice() &&
-                        hardware.isSondrelCompatible();
-  return hasThird ? 3 : 2;
-}
-
-}  // namespace
-
 void BaseViewController::viewDidLoad() {
   if (isViewLoaded_) return;
   isViewLoaded_ = true;
   title_ = titleOf(BaseViewNavigationIndexes::first);
   prefersLargeTitles_ = true;
   menuBar();
-  const HardwareManager& hardware = HardwareManager::shared();
-  hasExportButton_ = hardware.isCarrierBuild() || hardware.isInternalBuild();
+  hasExportButton_ = HardwareManager::shared().isInternalOrCarrierBuild();
   horvaneViewModel_ = std::make_shared<HorvaneViewModel>();
   carrierBar_ = std::make_unique<CarrierNameSegmentView>(horvaneViewModel_);
   embed(BaseViewNavigationIndexes::first);
@@ -50,7 +40,7 @@ void BaseViewController::viewWillAppear() {
 
 const std::shared_ptr<MenuBar>& BaseViewController::menuBar() {
   if (!menuBar_) {
-    menuBar_ = MenuBar::make(numberOfSegments(HardwareManager::shared()));
+    menuBar_ = MenuBar::make(HardwareManager::shared().isSondrelCompatible() ? 3 : 2);
     menuBar_->setDelegate(weak_from_this());
   }
   return menuBar_;

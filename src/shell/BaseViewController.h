@@ -21,6 +21,9 @@ class PersistanceStore;
 /// The tabs.
 enum class BaseViewNavigationIndexes { first, second, third };
 
+/// What the bar over a tab's screen says.
+const char* titleOf(BaseViewNavigationIndexes index);
+
 /// The container of the tabs' screens: the tab bar, the carrier bar under it, and the current tab's screen. A screen is
 /// made when its tab is first shown and kept from then on. Main thread.
 class BaseViewController final : public MenuBarDelegate, public std::enable_shared_from_this<BaseViewController> {
@@ -49,7 +52,8 @@ class BaseViewController final : public MenuBarDelegate, public std::enable_shar
   /// Null before the first display.
   CarrierNameSegmentView* carrierBar() const { return carrierBar_.get(); }
 
-  /// Made on first use, with three segments on a Mav device of an internal or carrier build that can capture logs.
+  /// Made on first use, with three segments on a device that can capture logs: a Mav one of an internal or carrier
+  /// build.
   const std::shared_ptr<MenuBar>& menuBar();
   const std::shared_ptr<DashboardViewController>& dashboardViewController();
   const std::shared_ptr<AllMetricsViewController>& firstLevelViewController();

@@ -8,16 +8,16 @@
 
 namespace quorl {
 
-/// One digit of a ticker. Main thread.
+/// One character of a ticker.
 struct TickerCell {
   std::string digit;
-  double fontSize = 40;
+  double fontSize = 40;  // points
 
   friend bool operator==(const TickerCell&, const TickerCell&) = default;
 };
 
 /// One column of a ticker: a small vertical list of characters that scrolls to the one to be shown. It takes no
-/// touches, and its rows have no separators.
+/// touches, and its rows have no separators. Main thread.
 class TickerColumnCell {
  public:
   enum class Size { mini, small, large };

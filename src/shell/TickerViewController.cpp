@@ -9,9 +9,10 @@ namespace {
 
 using Size = TickerColumnCell::Size;
 
+// Of columns, in points: the first and the two decimals, the decimal point, all between.
 constexpr double kEdgeWidth = 20;
 constexpr double kPointWidth = 8;
-constexpr double kWidth = 32;
+constexpr double kMiddleWidth = 32;
 
 bool isDigit(char character) {
   return character >= '0' && character <= '9';
@@ -57,7 +58,7 @@ void TickerViewController::updateColumns() {
 double TickerViewController::widthAt(std::size_t index) const {
   const std::size_t fromEnd = collectionView_.size() - 1 - index;
   if (index == 0 || fromEnd < 2) return kEdgeWidth;
-  return fromEnd == 2 ? kPointWidth : kWidth;
+  return fromEnd == 2 ? kPointWidth : kMiddleWidth;
 }
 
 void TickerViewController::scrollToValue() {

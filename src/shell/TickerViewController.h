@@ -23,7 +23,7 @@ class TickerViewController {
 
   std::vector<TickerColumnCell>& collectionView() { return collectionView_; }
   const std::vector<TickerColumnCell>& collectionView() const { return collectionView_; }
-  /// Of a column, by its position alone. `index` must be less than the number of columns.
+  /// Of a column in points, by its position alone. `index` must be less than the number of columns.
   double widthAt(std::size_t index) const;
 
   /// Sends each column to its character, up to the first one that has no such character.

@@ -1,6 +1,7 @@
 import QtQuick
 import Quorl
 
+// What a slider is set to, of which a part may be coloured.
 Text {
     horizontalAlignment: Text.AlignRight
     textFormat: Text.StyledText

@@ -158,8 +158,6 @@ FocusScope {
     }
 
     Item {
-        id: filesPlace
-
         anchors.top: parent.top
         anchors.topMargin: upper.height
         anchors.bottom: actions.top

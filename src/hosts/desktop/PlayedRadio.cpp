@@ -1,6 +1,8 @@
 #include "hosts/desktop/PlayedRadio.h"
 
 #include <algorithm>
+#include <chrono>
+#include <cstddef>
 #include <utility>
 
 #include "hosts/simulator/TimeShift.h"

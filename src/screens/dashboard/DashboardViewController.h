@@ -3,7 +3,6 @@
 #include <cstddef>
 #include <memory>
 #include <string>
-#include <vector>
 
 #include "base/Signal.h"
 #include "screens/dashboard/DashboardViewModel.h"

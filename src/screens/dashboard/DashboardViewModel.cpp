@@ -51,7 +51,7 @@ std::shared_ptr<DashboardViewModel> DashboardViewModel::make(std::shared_ptr<Per
 
 void DashboardViewModel::start() {
   const auto reloadUnlessGone = [weak = weak_from_this()](const Notification&) {
-    if (const auto self = weak.lock()) self->reload();
+    if (const auto self = weak.lock()) self->reload(/*isTick=*/false);
   };
   NotificationCenter& center = NotificationCenter::defaultCenter();
   subscriptionObservation_ = center.observe(notification::kSubsIdSelectionChange, reloadUnlessGone);
@@ -123,29 +123,23 @@ void DashboardViewModel::startTimer() {
 }
 
 void DashboardViewModel::modifyRefresh() {
-  loadDashboardData(
-      [weak = weak_from_this()](std::optional<std::vector<Metric>> rows, const std::optional<SQLiteError>& error) {
-        if (!rows) {
-          dashboardLog.error("error  ---> %{public}s", Description{error});
-          return;
-        }
-        const auto self = weak.lock();
-        if (!self) return;
-        self->updateDashboardDataSource(*rows);
-        if (const auto delegate = self->delegate_.lock())
-          delegate->updateLastRefreshed(dateText(Platform::current().clock.now()));
-      });
+  reload(/*isTick=*/true);
 }
 
-void DashboardViewModel::reload() {
-  loadDashboardData(
-      [weak = weak_from_this()](std::optional<std::vector<Metric>> rows, const std::optional<SQLiteError>& error) {
-        if (!rows) {
-          dashboardLog.error("error  ---> %{public}s", Description{error});
-          return;
-        }
-        if (const auto self = weak.lock()) self->updateDashboardDataSource(*rows);
-      });
+void DashboardViewModel::reload(bool isTick) {
+  loadDashboardData([weak = weak_from_this(), isTick](std::optional<std::vector<Metric>> rows,
+                                                      const std::optional<SQLiteError>& error) {
+    if (!rows) {
+      dashboardLog.error("error  ---> %{public}s", Description{error});
+      return;
+    }
+    const auto self = weak.lock();
+    if (!self) return;
+    self->updateDashboardDataSource(*rows);
+    if (!isTick) return;
+    if (const auto delegate = self->delegate_.lock())
+      delegate->updateLastRefreshed(dateText(Platform::current().clock.now()));
+  });
 }
 
 void DashboardViewModel::loadDashboardData(LoadCompletion completion) {

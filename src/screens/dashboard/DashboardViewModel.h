@@ -89,8 +89,8 @@ class DashboardViewModel final : public std::enable_shared_from_this<DashboardVi
   void loadInitialDashboard(SeedingCompletion completion);
   void loadSeededDashboard(SeedingCompletion completion);
   void startTimer();
-  /// What the notifications ask for: everything of a tick but the line that tells its time.
-  void reload();
+  /// Takes over the latest values. Of a tick of the timer the delegate is told the time, of a notification it is not.
+  void reload(bool isTick);
   void fetchReadings(const std::vector<DashboardTableItem>& pinned, LoadCompletion completion);
 
   const std::shared_ptr<PersistanceStore> persistanceStore_;

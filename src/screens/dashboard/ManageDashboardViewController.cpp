@@ -9,6 +9,7 @@
 #include "shell/NotificationNames.h"
 
 namespace quorl {
+
 std::shared_ptr<ManageDashboardViewController> ManageDashboardViewController::make(
     std::shared_ptr<PersistanceStore> store, std::vector<DashboardTableItem> dashboardList) {
   return std::shared_ptr<ManageDashboardViewController>(

@@ -31,10 +31,11 @@ class UtcTextWriter {
     const auto day = std::chrono::floor<std::chrono::days>(seconds);
     if (day != day_ || dayText_.empty()) {
       day_ = day;
-      dayText_ = utcText(date).substr(0, utcText(date).find(' '));
+      const std::string text = utcText(date);
+      dayText_ = text.substr(0, text.find(' '));
     }
     const std::int64_t second = (seconds - day).count();
-    std::array<char, 15> clock;
+    std::array<char, 9> clock;  // " 09:30:12"
     char* at = clock.data();
     *at++ = ' ';
     appendTwoDigits(at, second / 3600);
@@ -42,7 +43,7 @@ class UtcTextWriter {
     appendTwoDigits(at, second / 60 % 60);
     *at++ = ':';
     appendTwoDigits(at, second % 60);
-    text.append(dayText_).append(clock.data(), 9).append(" +0000");
+    text.append(dayText_).append(clock.data(), clock.size()).append(" +0000");
   }
 
  private:

@@ -41,7 +41,7 @@ void ExportView::didTapExportButton() {
   generalLog.log("Export View - didTapExportButton");
   const auto screen = delegate_.lock();
   if (!screen) return;
-  screen->loadingView().setLoadingLabelText("Gathering metrics from database");
+  screen->loadingView().setLoadingLabelText(kGatheringText);
   screen->loadingView().show();
   screen->persistanceStore()->exportMetrics(
       timeFrame_, [delegate = delegate_, fileName = fileName()](const ExportedMetrics& metrics,

@@ -10,6 +10,9 @@ namespace quorl {
 
 class PersistanceStore;
 
+/// What the loading view says while an export is gathered.
+inline constexpr char kGatheringText[] = "Gathering metrics from database";
+
 /// What a row of the export screen needs of it.
 class ExportViewDelegate {
  public:
@@ -31,7 +34,7 @@ class ExportView {
   std::string fileName() const;
 
   /// Gathers all rows of the time frame and hands them to the share facility as one text, which is made as it is taken.
-  /// After a failed read the loading view stays.
+  /// A failed read is logged, and the loading view stays.
   void didTapExportButton();
 
  private:

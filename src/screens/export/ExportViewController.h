@@ -30,7 +30,7 @@ class ExportViewController final : public ExportViewDelegate {
 
  private:
   explicit ExportViewController(std::shared_ptr<PersistanceStore> store)
-      : persistanceStore_(std::move(store)), loadingView_("Gathering metrics from database") {}
+      : persistanceStore_(std::move(store)), loadingView_(kGatheringText) {}
 
   const std::shared_ptr<PersistanceStore> persistanceStore_;
   LoadingView loadingView_;

@@ -2,10 +2,8 @@
 
 #include <cerrno>
 #include <cstdio>
-#include <optional>
 #include <string_view>
 #include <system_error>
-#include <utility>
 
 #include <fcntl.h>
 #include <stdlib.h>

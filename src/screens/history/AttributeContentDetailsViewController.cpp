@@ -1,6 +1,5 @@
 #include "screens/history/AttributeContentDetailsViewController.h"
 
-#include <optional>
 #include <utility>
 
 #include "base/FatalStop.h"
@@ -8,6 +7,7 @@
 #include "shell/Logs.h"
 
 namespace quorl {
+
 std::shared_ptr<AttributeContentDetailsViewController> AttributeContentDetailsViewController::make(
     std::shared_ptr<PersistanceStore> store, Metric metric) {
   return std::shared_ptr<AttributeContentDetailsViewController>(

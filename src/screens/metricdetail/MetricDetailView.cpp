@@ -28,7 +28,7 @@ void MetricDetailView::refresh() {
   }
   sections_.clear();
   for (const MetricSectional& sectional : viewModel_->metricSectionals())
-    sections_.push_back(makeSection("CA Status " + sectional.sectionName, sectional.sectionMetrics,
+    sections_.push_back(makeSection(std::string(kCaStatusName) + " " + sectional.sectionName, sectional.sectionMetrics,
                                     /*isSectioned=*/true, earlier));
   if (sections_.empty())
     sections_.push_back(makeSection(std::string(), viewModel_->metrics(), /*isSectioned=*/false, earlier));

@@ -4,6 +4,7 @@
 #include "shell/Logs.h"
 
 namespace quorl {
+
 void MetricDetailViewDelegate::showGraphForItemAt(const MetricDetailViewModel& model, std::size_t index,
                                                   std::size_t sectionIndex, bool isSectioned) {
   const Metric* metric = model.row(index, sectionIndex, isSectioned);

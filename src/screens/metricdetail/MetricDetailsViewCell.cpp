@@ -8,6 +8,7 @@
 #include "shell/Logs.h"
 
 namespace quorl {
+
 MetricDetailsViewCell::MetricDetailsViewCell(Metric metricObject, bool isBookmarked, Actions actions)
     : metricObject_(std::move(metricObject)), actions_(std::move(actions)), isBookmarked_(isBookmarked) {}
 
@@ -21,8 +22,7 @@ std::string MetricDetailsViewCell::valueText() const {
 }
 
 bool MetricDetailsViewCell::showsGraphSymbol() const {
-  const HardwareManager& hardware = HardwareManager::shared();
-  return (hardware.isInternalBuild() || hardware.isCarrierBuild()) && metricObject_.graphable;
+  return HardwareManager::shared().isInternalOrCarrierBuild() && metricObject_.graphable;
 }
 
 void MetricDetailsViewCell::tapGraph() {

@@ -1,7 +1,6 @@
 #pragma once
 
 #include <functional>
-#include <memory>
 #include <string>
 
 #include "base/Signal.h"
@@ -29,9 +28,8 @@ class MetricDetailsViewCell {
   /// The value as shown: "10 MHz" for a bandwidth of 50 resource blocks.
   std::string valueText() const;
 
-  /// Only builds for engineers and carriers show graphs.
+  /// Only internal and carrier builds show graphs.
   bool showsGraphSymbol() const;
-  static constexpr char graphSymbol[] = "arrow.right.circle";
   /// Flips at the tap and stays so, whatever becomes of the statement.
   bool isBookmarked() const { return isBookmarked_.get(); }
   const char* bookmarkSymbol() const { return isBookmarked() ? "bookmark.fill" : "bookmark"; }

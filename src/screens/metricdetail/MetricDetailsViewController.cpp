@@ -6,6 +6,7 @@
 #include "shell/Logs.h"
 
 namespace quorl {
+
 std::shared_ptr<MetricDetailsViewController> MetricDetailsViewController::make(std::shared_ptr<PersistanceStore> store,
                                                                                std::string metricTech,
                                                                                std::string metricName,

@@ -5,6 +5,7 @@
 
 #include "app/HardwareManager.h"
 #include "platform/Platform.h"
+#include "screens/metricdetail/MetricSections.h"
 #include "shell/Logs.h"
 #include "shell/NotificationNames.h"
 
@@ -17,7 +18,7 @@ constexpr char kTelephonyTech[] = "RAT";
 AllMetricsDataSource telephonyGroup() {
   const HardwareManager& hardware = HardwareManager::shared();
   const Date now = Platform::current().clock.now();
-  AllMetricsDataSource group{kTelephonyTech, {{"Cell Info", now, hardware.currentSubsId()}}};
+  AllMetricsDataSource group{kTelephonyTech, {{kCellInfoName, now, hardware.currentSubsId()}}};
   if (hardware.isInternalOrCarrierBuild()) {
     group.rowItems.push_back({"Active Bands", now, hardware.currentSubsId()});
     group.rowItems.push_back({"Supported Bands", now, hardware.currentSubsId()});

@@ -14,6 +14,8 @@ T.AbstractButton {
     // Whether a long value takes several lines.
     property bool wraps: false
     default property alias trailing: trailingItems.data
+    // The first value is not a change.
+    property bool isReady: false
 
     signal copyRequested
 
@@ -37,18 +39,11 @@ T.AbstractButton {
         event.accepted = true
     }
 
-    background: Rectangle {
-        color: row.pressed ? Theme.pressed : "transparent"
-        border.width: row.activeFocus && FocusRing.isShown ? 2 : 0
-        border.color: Theme.buttonSelected
+    onValueChanged: if (isReady && !Theme.reducedMotion) fade.restart()
+    Component.onCompleted: isReady = true
 
-        Rectangle {
-            x: Theme.margin
-            anchors.bottom: parent.bottom
-            width: parent.width - x
-            height: 1
-            color: Theme.line
-        }
+    background: RowBackground {
+        control: row
     }
 
     contentItem: Item {
@@ -117,10 +112,7 @@ T.AbstractButton {
         }
 
         Rectangle {
-            id: tint
-
             objectName: "changeTint"
-
             anchors.fill: valueText
             anchors.margins: -Theme.grid
             radius: Theme.grid
@@ -155,9 +147,4 @@ T.AbstractButton {
             anchors.verticalCenter: parent.verticalCenter
         }
     }
-
-    // The first value is not a change.
-    property bool isReady: false
-    onValueChanged: if (isReady && !Theme.reducedMotion) fade.restart()
-    Component.onCompleted: isReady = true
 }

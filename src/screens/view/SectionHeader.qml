@@ -27,10 +27,7 @@ Rectangle {
         elide: Text.ElideMiddle
         textFormat: Text.PlainText
     }
-    Rectangle {
+    Separator {
         anchors.bottom: parent.bottom
-        width: parent.width
-        height: 1
-        color: Theme.line
     }
 }

@@ -12,7 +12,6 @@ Item {
     // 0 at the circle's smallest, 1 when the view is in its place.
     property real progress: 0
     readonly property real viewScale: binding.smallestScale + (1 - binding.smallestScale) * progress
-    readonly property bool isRunning: animation.running
 
     signal finished
 

@@ -84,14 +84,10 @@ Item {
         visible: cell.showsActivityIndicator
         isAnimating: visible
     }
-    Rectangle {
+    Separator {
         objectName: "separatorView"
-        anchors.left: parent.left
-        anchors.right: parent.right
-        anchors.leftMargin: cell.inset
         anchors.bottom: parent.bottom
-        height: 1
+        inset: cell.inset
         visible: cell.showsSeparator
-        color: Theme.line
     }
 }

@@ -28,10 +28,9 @@ Rectangle {
                 required property bool isSelected
 
                 objectName: "menuCell" + index
-                width: bar.width / bar.binding.multiplier
+                width: bar.binding.itemWidth(bar.width)
                 height: bar.height
                 text: name
-                checkable: false
                 onClicked: bar.binding.press(index)
                 Accessible.role: Accessible.PageTab
                 Accessible.selectable: true
@@ -60,7 +59,7 @@ Rectangle {
         function move() {
             movement.stop()
             from = place()
-            to = bar.binding.selectedIndex / bar.binding.multiplier
+            to = bar.binding.markerX(1)
             part = 0
             movement.start()
         }
@@ -68,7 +67,7 @@ Rectangle {
         objectName: "menuMarker"
         x: bar.width * place()
         anchors.bottom: parent.bottom
-        width: bar.width / bar.binding.multiplier
+        width: bar.binding.itemWidth(bar.width)
         height: bar.binding.markerHeight
         color: Theme.buttonSelected
 
@@ -79,9 +78,7 @@ Rectangle {
             to: 1
             duration: Theme.duration(bar.binding.durationMs)
         }
-        Component.onCompleted: {
-            from = to = bar.binding.selectedIndex / bar.binding.multiplier
-        }
+        Component.onCompleted: from = to = bar.binding.markerX(1)
     }
 
     Connections {

@@ -1,18 +1,10 @@
 #include "shell/view/MenuBarBinding.h"
 
-#include <QString>
-#include <array>
-
+#include "shell/BaseViewController.h"
 #include "shell/view/Appearance.h"
 #include "shell/view/QtText.h"
 
 namespace quorl::view {
-namespace {
-
-// What a screen reader says of an icon.
-constexpr std::array kNames = {"Dashboard", "All Metrics", "Sondrel"};
-
-}  // namespace
 
 MenuBarBinding::MenuBarBinding(std::shared_ptr<MenuBar> bar, QObject* parent)
     : QAbstractListModel(parent), bar_(std::move(bar)), selection_(bar_->onSelect([this] {
@@ -37,7 +29,7 @@ QVariant MenuBarBinding::data(const QModelIndex& index, int role) const {
       return toQt(cell.tint());
     case NameRole:
     case Qt::DisplayRole:
-      return toQt(kNames[row]);
+      return toQt(titleOf(static_cast<BaseViewNavigationIndexes>(row)));
     default:
       return {};
   }

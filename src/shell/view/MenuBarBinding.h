@@ -15,15 +15,18 @@ class MenuBarBinding final : public QAbstractListModel {
   Q_OBJECT
   QML_ELEMENT
   QML_UNCREATABLE("made by the shell")
-  Q_PROPERTY(int selectedIndex READ selectedIndex NOTIFY selected)
   Q_PROPERTY(int count READ count CONSTANT)
-  Q_PROPERTY(double multiplier READ multiplier CONSTANT)
   Q_PROPERTY(double barHeight READ barHeight CONSTANT)
   Q_PROPERTY(double markerHeight READ markerHeight CONSTANT)
   Q_PROPERTY(int durationMs READ durationMs CONSTANT)
 
  public:
-  enum Role { ImageNameRole = Qt::UserRole, IsSelectedRole, TintRole, NameRole };
+  enum Role {
+    ImageNameRole = Qt::UserRole,
+    IsSelectedRole,
+    TintRole,
+    NameRole,  // what a screen reader says of the icon
+  };
 
   explicit MenuBarBinding(std::shared_ptr<MenuBar> bar, QObject* parent = nullptr);
 
@@ -31,15 +34,17 @@ class MenuBarBinding final : public QAbstractListModel {
   QVariant data(const QModelIndex& index, int role) const override;
   QHash<int, QByteArray> roleNames() const override;
 
-  int selectedIndex() const { return static_cast<int>(bar_->selectedIndex()); }
   int count() const { return bar_->numberOfSegments(); }
-  double multiplier() const { return bar_->segmentWidthMultiplier(); }
   double barHeight() const { return MenuBar::height; }
   double markerHeight() const { return MenuBar::horizontalViewBarHeight; }
   /// Of the marker's movement.
   int durationMs() const;
 
   Q_INVOKABLE void press(int index);
+  /// See `MenuBar::itemWidth`.
+  Q_INVOKABLE double itemWidth(double barWidth) const { return bar_->itemWidth(barWidth); }
+  /// See `MenuBar::markerX`.
+  Q_INVOKABLE double markerX(double barWidth) const { return bar_->markerX(barWidth); }
   /// See `MenuBar::markerProgress`.
   Q_INVOKABLE double markerProgress(double part) const { return MenuBar::markerProgress(part); }
 

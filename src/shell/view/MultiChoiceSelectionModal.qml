@@ -64,13 +64,9 @@ FocusScope {
             background: Rectangle {
                 color: row.down ? Theme.pressed : row.ListView.isCurrentItem && list.activeFocus ? Theme.card : Theme.background
 
-                Rectangle {
-                    anchors.left: parent.left
-                    anchors.right: parent.right
-                    anchors.leftMargin: Theme.margin
+                Separator {
                     anchors.bottom: parent.bottom
-                    height: 1
-                    color: Theme.line
+                    inset: Theme.margin
                 }
             }
             contentItem: Text {

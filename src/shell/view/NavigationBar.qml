@@ -105,11 +105,8 @@ Rectangle {
 
         anchors.fill: parent
     }
-    Rectangle {
+    Separator {
         anchors.bottom: parent.bottom
-        width: parent.width
-        height: 1
-        color: Theme.line
         opacity: bar.showsBack ? bar.collapse : 0
     }
 }

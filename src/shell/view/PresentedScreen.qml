@@ -10,10 +10,10 @@ FocusScope {
     property real presence: 1
     property bool isLeaving: false
 
-    // A screen that is done in less says so.
-    readonly property real sheetHeight: screen.sheetHeight === undefined ? 760 : screen.sheetHeight + 2 * place.anchors.margins
-
     readonly property bool isSheet: width >= Theme.wideWidth
+    // A screen that is done in less says so.
+    readonly property real sheetHeight: screen.sheetHeight === undefined ? 760
+                                                                         : screen.sheetHeight + 2 * place.anchors.margins
 
     signal gone
 
@@ -61,8 +61,6 @@ FocusScope {
         onWheel: wheel => wheel.accepted = true
     }
     Rectangle {
-        id: content
-
         width: sheet.isSheet ? Math.min(sheet.width - 4 * Theme.margin, 640) : sheet.width
         height: sheet.isSheet ? Math.min(sheet.height - 4 * Theme.margin, sheet.sheetHeight) : sheet.height
         x: (sheet.width - width) / 2

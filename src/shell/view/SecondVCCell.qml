@@ -44,15 +44,11 @@ T.AbstractButton {
     background: Rectangle {
         color: cell.activeFocus && FocusRing.isShown ? Theme.card : "transparent"
 
-        Rectangle {
+        Separator {
             objectName: "separatorView"
-            anchors.left: parent.left
-            anchors.right: parent.right
-            anchors.leftMargin: Theme.margin
             anchors.bottom: parent.bottom
-            height: 1
+            inset: Theme.margin
             visible: cell.showsSeparator
-            color: Theme.line
         }
     }
     contentItem: Item {

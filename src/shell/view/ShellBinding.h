@@ -3,7 +3,6 @@
 #include <QObject>
 #include <QString>
 #include <QStringList>
-#include <memory>
 #include <vector>
 
 #include <QtQml/qqmlregistration.h>

@@ -1,7 +1,7 @@
 import QtQuick
 import Quorl
 
-// One digit of a ticker.
+// One character of a ticker.
 Text {
     property string digit
     property real fontSize: 40

@@ -18,7 +18,7 @@ TickerColumnsModel::TickerColumnsModel(TickerViewController& ticker, QObject* pa
 
 void TickerColumnsModel::setNumberValue(double value) {
   ticker_.setNumberValue(value);
-  emit numberValueChanged();
+  emit stringValueChanged();
 }
 
 QString TickerColumnsModel::stringValue() const {

@@ -14,16 +14,16 @@ class TickerColumnsModel final : public QAbstractListModel {
   Q_OBJECT
   QML_ELEMENT
   QML_UNCREATABLE("made by its screen")
-  Q_PROPERTY(double numberValue READ numberValue WRITE setNumberValue NOTIFY numberValueChanged)
-  Q_PROPERTY(QString stringValue READ stringValue NOTIFY numberValueChanged)
+  Q_PROPERTY(QString stringValue READ stringValue NOTIFY stringValueChanged)
 
  public:
   enum Role { CharactersRole = Qt::UserRole + 1, WidthRole, FontSizeRole, RowRole };
 
   explicit TickerColumnsModel(TickerViewController& ticker, QObject* parent = nullptr);
 
-  double numberValue() const { return ticker_.numberValue(); }
+  /// See `TickerViewController::setNumberValue`.
   void setNumberValue(double value);
+  /// What the columns show.
   QString stringValue() const;
   /// The column's movement has begun or ended.
   Q_INVOKABLE void setScrolling(int column, bool isScrolling);
@@ -33,7 +33,7 @@ class TickerColumnsModel final : public QAbstractListModel {
   QHash<int, QByteArray> roleNames() const override;
 
  signals:
-  void numberValueChanged();
+  void stringValueChanged();
 
  private:
   void reload();

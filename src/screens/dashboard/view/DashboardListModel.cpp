@@ -5,7 +5,6 @@
 #include "intake/MetricGroupV2.h"
 #include "screens/dashboard/DashboardViewController.h"
 #include "screens/view/ShownValue.h"
-#include "shell/TimeTexts.h"
 
 namespace quorl::view {
 
@@ -31,8 +30,6 @@ QVariant DashboardListModel::data(const QModelIndex& index, int role) const {
       return row.context;
     case ValueRole:
       return row.value;
-    case TimeRole:
-      return row.time;
     case TraceRole:
       return QVariant::fromValue(row.heights);
     default:
@@ -41,14 +38,13 @@ QVariant DashboardListModel::data(const QModelIndex& index, int role) const {
 }
 
 QHash<int, QByteArray> DashboardListModel::roleNames() const {
-  return {{NameRole, "name"}, {ContextRole, "context"}, {ValueRole, "value"}, {TimeRole, "time"}, {TraceRole, "trace"}};
+  return {{NameRole, "name"}, {ContextRole, "context"}, {ValueRole, "value"}, {TraceRole, "trace"}};
 }
 
 DashboardListModel::Row DashboardListModel::rowOf(const DashboardViewModelObject& object) {
   Row row{toQt(dashboardNameText(object)),
           toQt(object.metricTech + " · " + object.metricName),
           shownValue(dashboardValueText(object)),
-          toQt(timeText(object.timeStamp)),
           {},
           {}};
   addToTrace(row, object);
@@ -87,12 +83,10 @@ void DashboardListModel::refresh(std::size_t index) {
   const DashboardViewModelObject& object = viewModel_->metrics()[index];
   Row& row = rows_[index];
   const QString value = shownValue(dashboardValueText(object));
-  const QString time = toQt(timeText(object.timeStamp));
   QList<qreal> heights = std::exchange(row.heights, {});
   addToTrace(row, object);
   QList<int> roles;
   if (std::exchange(row.value, value) != value) roles << ValueRole;
-  if (std::exchange(row.time, time) != time) roles << TimeRole;
   if (row.heights != heights) roles << TraceRole;
   const QModelIndex place = this->index(static_cast<int>(index));
   if (!roles.isEmpty()) emit dataChanged(place, place, roles);

@@ -26,7 +26,6 @@ class DashboardListModel final : public QAbstractListModel {
     NameRole = Qt::UserRole,
     ContextRole,  // technology and metric
     ValueRole,
-    TimeRole,
     TraceRole,  // heights from 0 to 1, in order of time; empty where there is none
   };
 
@@ -41,7 +40,6 @@ class DashboardListModel final : public QAbstractListModel {
     QString name;
     QString context;
     QString value;
-    QString time;
     ReadingTrace trace;
     QList<qreal> heights;
   };

@@ -60,11 +60,8 @@ FocusScope {
             text: root.binding.manageControlText
             onClicked: root.binding.manageDashboardTapped()
         }
-        Rectangle {
+        Separator {
             anchors.bottom: parent.bottom
-            width: parent.width
-            height: 1
-            color: Theme.line
         }
     }
 

@@ -62,13 +62,10 @@ FocusScope {
         color: Theme.header
     }
 
-    Rectangle {
+    Separator {
         id: line
 
         anchors.top: hint.bottom
-        width: parent.width
-        height: 1
-        color: Theme.line
     }
 
     ListView {
@@ -91,6 +88,7 @@ FocusScope {
             required property int index
             required property string name
             required property string context
+            readonly property bool isSwiped: swipe.position === -1 && !pressed
 
             objectName: "managedRow"
             width: ListView.view.width
@@ -152,18 +150,9 @@ FocusScope {
                 }
             }
 
-            background: Rectangle {
-                color: row.down ? Theme.mixed(Theme.background, Theme.title, 0.08) : Theme.background
-                border.width: row.activeFocus && FocusRing.isShown ? 2 : 0
-                border.color: Theme.buttonSelected
-
-                Rectangle {
-                    x: Theme.margin
-                    anchors.bottom: parent.bottom
-                    width: parent.width - x
-                    height: 1
-                    color: Theme.line
-                }
+            background: RowBackground {
+                control: row
+                color: row.down ? Theme.pressed : Theme.background
             }
 
             swipe.right: Rectangle {
@@ -192,7 +181,6 @@ FocusScope {
                     }
                 }
             }
-            readonly property bool isSwiped: swipe.position === -1 && !pressed
             onIsSwipedChanged: {
                 if (!isSwiped)
                     return

@@ -79,22 +79,12 @@ FocusScope {
                 Keys.onReturnPressed: clicked()
                 Keys.onEnterPressed: clicked()
 
-                background: Rectangle {
-                    color: option.pressed ? Theme.pressed : "transparent"
-                    border.width: option.activeFocus && FocusRing.isShown ? 2 : 0
-                    border.color: Theme.buttonSelected
+                background: RowBackground {
+                    control: option
+                    inset: 0
 
-                    Rectangle {
+                    Separator {
                         visible: option.index === 0
-                        width: parent.width
-                        height: 1
-                        color: Theme.line
-                    }
-                    Rectangle {
-                        anchors.bottom: parent.bottom
-                        width: parent.width
-                        height: 1
-                        color: Theme.line
                     }
                 }
                 contentItem: Item {

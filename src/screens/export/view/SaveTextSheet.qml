@@ -41,31 +41,12 @@ Popup {
         NumberAnimation { property: "opacity"; from: 0; to: 1; duration: Theme.duration(150) }
     }
 
-    component Field: TextField {
-        id: field
-
-        height: Theme.touch
-        leftPadding: 3 * Theme.grid
-        rightPadding: 3 * Theme.grid
-        font.pixelSize: Theme.row
-        color: Theme.title
-        selectByMouse: true
-
-        background: Rectangle {
-            radius: 2 * Theme.grid
-            color: Theme.card
-            border.width: field.activeFocus ? 2 : 1
-            border.color: field.activeFocus ? Theme.buttonSelected : Theme.line
-        }
-    }
     component FieldLabel: Text {
         font.pixelSize: Theme.caption
         color: Theme.header
     }
 
     contentItem: Column {
-        id: column
-
         objectName: "saveSheetContent"
         spacing: 2 * Theme.grid
         Keys.onEscapePressed: sheet.stage === SaveText.Replacing ? SaveText.keep() : SaveText.close()

@@ -62,7 +62,6 @@ FocusScope {
     SpinningView {
         anchors.fill: parent
         isShowing: !root.binding.isLoaded && !spinnerDelay.running
-        text: qsTr("Loading...")
 
         Delay {
             id: spinnerDelay

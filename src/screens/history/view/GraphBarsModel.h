@@ -1,7 +1,6 @@
 #pragma once
 
 #include <QAbstractListModel>
-#include <QString>
 #include <memory>
 #include <vector>
 

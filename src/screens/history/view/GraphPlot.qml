@@ -43,11 +43,8 @@ FocusScope {
                 y: modelData.y
                 width: plot.width
 
-                Rectangle {
-                    x: axis.width
-                    width: parent.width - x
-                    height: 1
-                    color: Theme.line
+                Separator {
+                    inset: axis.width
                 }
                 Text {
                     objectName: "tick"
@@ -72,11 +69,9 @@ FocusScope {
             }
         }
 
-        Rectangle {
-            x: axis.width
+        Separator {
+            inset: axis.width
             y: root.binding.baseline
-            width: parent.width - x
-            height: 1
             color: Theme.header
         }
     }
@@ -163,8 +158,6 @@ FocusScope {
 
     // Value and time of the selected bar, above it.
     Rectangle {
-        id: bubble
-
         // A bar that was scrolled out of sight and comes back is another item.
         readonly property Item bar: root.binding.selectedIndex < 0 || list.contentX === undefined
                                     ? null : list.itemAtIndex(root.binding.selectedIndex)

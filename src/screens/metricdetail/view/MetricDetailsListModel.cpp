@@ -54,8 +54,6 @@ QVariant MetricDetailsListModel::data(const QModelIndex& index, int role) const 
     case Qt::DisplayRole:
     case NameRole:
       return toQt(attribute->name);
-    case RawNameRole:
-      return toQt(attribute->rawName);
     case ValueRole:
       return shownValue(attribute->value);
     case BookmarkedRole:
@@ -68,8 +66,7 @@ QVariant MetricDetailsListModel::data(const QModelIndex& index, int role) const 
 }
 
 QHash<int, QByteArray> MetricDetailsListModel::roleNames() const {
-  return {{SectionRole, "section"},       {NameRole, "name"},       {RawNameRole, "rawName"}, {ValueRole, "value"},
-          {BookmarkedRole, "bookmarked"}, {GraphRole, "showsGraph"}};
+  return {{SectionRole, "section"}, {NameRole, "name"}, {ValueRole, "value"}, {BookmarkedRole, "bookmarked"}, {GraphRole, "showsGraph"}};
 }
 
 }  // namespace quorl::view

@@ -1,6 +1,5 @@
 #pragma once
 
-#include <QString>
 #include <memory>
 #include <string>
 #include <vector>
@@ -33,7 +32,7 @@ class MetricDetailsListModel : public RowsModel<MetricDetailsRow> {
   QML_UNCREATABLE("made by its binding")
 
  public:
-  enum Role { SectionRole = Qt::UserRole, NameRole, RawNameRole, ValueRole, BookmarkedRole, GraphRole };
+  enum Role { SectionRole = Qt::UserRole, NameRole, ValueRole, BookmarkedRole, GraphRole };
 
   using RowsModel<MetricDetailsRow>::RowsModel;
 

@@ -42,13 +42,10 @@ FocusScope {
             color: Theme.header
         }
     }
-    Rectangle {
+    Separator {
         id: line
 
         anchors.top: lastSeenLine.bottom
-        width: parent.width
-        height: 1
-        color: Theme.line
     }
 
     ListView {

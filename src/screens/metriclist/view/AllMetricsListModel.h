@@ -1,8 +1,6 @@
 #pragma once
 
 #include <QSortFilterProxyModel>
-#include <QString>
-#include <cstddef>
 #include <string>
 #include <vector>
 

@@ -1,5 +1,4 @@
 import QtQuick
-import QtQuick.Controls.Basic
 import QtQuick.Templates as T
 import Quorl
 
@@ -81,31 +80,19 @@ FocusScope {
         height: isOpen ? Theme.touch + Theme.grid : 0
         visible: isOpen
 
-        TextField {
+        Field {
             id: filterField
 
             objectName: "filterField"
             x: Theme.margin
             width: parent.width - x - clearButton.width - Theme.grid
-            height: Theme.touch
-            leftPadding: 3 * Theme.grid
             placeholderText: qsTr("Metric or technology")
-            placeholderTextColor: Theme.header
-            font.pixelSize: Theme.row
-            color: Theme.title
             Accessible.name: qsTr("Filter")
             onTextChanged: root.binding.filterText = text
             // The shell's Escape goes back.
             Keys.onShortcutOverride: event => event.accepted = event.key === Qt.Key_Escape
             Keys.onEscapePressed: root.closeFilter()
             Keys.onDownPressed: list.forceActiveFocus()
-
-            background: Rectangle {
-                radius: 2 * Theme.grid
-                color: Theme.card
-                border.width: filterField.activeFocus ? 2 : 1
-                border.color: filterField.activeFocus ? Theme.buttonSelected : Theme.line
-            }
         }
         SymbolButton {
             id: clearButton
@@ -209,23 +196,15 @@ FocusScope {
             Keys.onReturnPressed: clicked()
             Keys.onEnterPressed: clicked()
 
-            background: Rectangle {
+            background: RowBackground {
+                control: row
                 color: row.pressed ? Theme.pressed : row.isSelected ? Theme.card : "transparent"
-                border.width: row.activeFocus && FocusRing.isShown ? 2 : 0
-                border.color: Theme.buttonSelected
 
                 Rectangle {
                     visible: row.isSelected
                     width: Theme.grid
                     height: parent.height
                     color: Theme.buttonSelected
-                }
-                Rectangle {
-                    x: Theme.margin
-                    anchors.bottom: parent.bottom
-                    width: parent.width - x
-                    height: 1
-                    color: Theme.line
                 }
             }
 
