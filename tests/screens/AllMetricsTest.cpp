@@ -298,7 +298,6 @@ TEST_F(AllMetricsTest, AFailedReadLeavesTheListAndLogs) {
   loses("Metric");
   EXPECT_EQ(loaded(), false);
   EXPECT_THAT(techs(), ElementsAre("RAT", "LTE"));
-  const auto lines = log.lines();
   ASSERT_EQ(log.texts("allmetrics").size(), 3U);
   const std::string description = log.texts("allmetrics")[1].substr(sizeof "error occurred  ---> " - 1);
   EXPECT_THAT(description, ::testing::StartsWith("Prepare(message: "));

@@ -1,6 +1,4 @@
 #include "ScreenTest.h"
-#include "app/HardwareManager.h"
-#include "base/NotificationCenter.h"
 #include "screens/dashboard/DashboardViewController.h"
 #include "shell/NotificationNames.h"
 
@@ -180,26 +178,22 @@ TEST_F(ManageDashboardTest, AFailedSwipeIsLoggedAndShownInAnAlertOnTheMainQueue)
 TEST_F(ManageDashboardTest, AFailedSwipeTellsNobodyElse) {
   openWithTwoReadings();
   openManaging();
-  int posted = 0;
-  const auto observation = NotificationCenter::defaultCenter().observe(notification::kRemovedDashboardMetric,
-                                                                       [&](const Notification&) { ++posted; });
+  const test::PostCounter posted(notification::kRemovedDashboardMetric);
   const auto lock = lockDatabase();
   managing->swipeToDelete(0);
   settle();
-  EXPECT_EQ(posted, 0);
+  EXPECT_EQ(posted.count(), 0);
 }
 
 TEST_F(ManageDashboardTest, ASwipeCountsThoughTheScreenHasGone) {
   openWithTwoReadings();
   openManaging();
-  int posted = 0;
-  const auto observation = NotificationCenter::defaultCenter().observe(notification::kRemovedDashboardMetric,
-                                                                       [&](const Notification&) { ++posted; });
+  const test::PostCounter posted(notification::kRemovedDashboardMetric);
   managing->swipeToDelete(0);
   managing.reset();
   settle();
   EXPECT_EQ(number("SELECT count(*) FROM Dashboard"), 1);
-  EXPECT_EQ(posted, 1);
+  EXPECT_EQ(posted.count(), 1);
 }
 
 TEST_F(ManageDashboardTest, TheCrossClosesIt) {

@@ -1,8 +1,7 @@
+#include <algorithm>
 #include <map>
 
 #include "ScreenTest.h"
-#include "app/HardwareManager.h"
-#include "base/NotificationCenter.h"
 #include "screens/dashboard/DashboardViewModel.h"
 #include "shell/NotificationNames.h"
 
@@ -91,10 +90,7 @@ TEST_F(DashboardTest, ShowsTheLatestValueOfEachPin) {
 
 TEST_F(DashboardTest, AStartWithReadingsLogsItsSteps) {
   launch();
-  pinned("LTE", "Tx Power", "power");
-  pinned("LTE", "Tx Power", "band");
-  stored(reading("LTE", "Tx Power", "power", "11"));
-  stored(reading("LTE", "Tx Power", "band", "3"));
+  hasADashboard();
   log.clear();
   open();
   EXPECT_THAT(log.texts("dashboard"),
@@ -180,10 +176,7 @@ TEST_F(DashboardTest, RemovingAllPinsButOneMakesTheNextStartSeedAgain) {
   isIce();
   livesNow();
   launch();
-  pinned("LTE", "Tx Power", "power");
-  pinned("LTE", "Tx Power", "band");
-  stored(reading("LTE", "Tx Power", "power", "11"));
-  stored(reading("LTE", "Tx Power", "band", "3"));
+  hasADashboard();
   open();
   sql("DELETE FROM Dashboard WHERE attribute_name = 'band'");
   aPinIsRemovedElsewhere();
@@ -397,10 +390,7 @@ TEST_F(DashboardTest, AModelThatIsGoneHearsNothing) {
 
 TEST_F(DashboardTest, MayGoWhileItLoads) {
   launch();
-  pinned("LTE", "Tx Power", "power");
-  pinned("LTE", "Tx Power", "band");
-  stored(reading("LTE", "Tx Power", "power", "11"));
-  stored(reading("LTE", "Tx Power", "band", "3"));
+  hasADashboard();
   model = DashboardViewModel::make(store);
   databaseQueue().step();
   platform.mainQueue->step();

@@ -10,11 +10,13 @@
 
 namespace quorl::test {
 
+/// Counts what a model asks of its screen.
 struct DetailScreen final : MetricDetailViewModelDelegate {
   void refresh() override { ++refreshes; }
   int refreshes = 0;
 };
 
+/// A model of the detail screen on its own, without the screen.
 class MetricDetailTest : public ScreenTest {
  protected:
   void open(const std::string& tech, const std::string& name, std::int32_t subsId = 0) {

@@ -1,5 +1,4 @@
 #include "MetricDetailFixture.h"
-#include "base/NotificationCenter.h"
 #include "shell/NotificationNames.h"
 
 namespace quorl {
@@ -105,14 +104,12 @@ TEST_F(MetricDetailPinsTest, UnpinningDeletesAndTellsTheDashboard) {
   pinned("LTE", "Tx Power", "power");
   pinned("LTE", "Tx Power", "power");
   opened("LTE", "Tx Power");
-  int posted = 0;
-  const auto observation = NotificationCenter::defaultCenter().observe(notification::kRemovedDashboardMetric,
-                                                                       [&](const Notification&) { ++posted; });
+  const test::PostCounter posted(notification::kRemovedDashboardMetric);
   model->updateDashboardItem(0, /*isBookmarked=*/false, 0, false);
   settle();
   EXPECT_EQ(number("SELECT count(*) FROM Dashboard"), 0);
   EXPECT_TRUE(log.has(line("metricDetail", "attribute deleted from dashboard table")));
-  EXPECT_EQ(posted, 1);
+  EXPECT_EQ(posted.count(), 1);
 }
 
 TEST_F(MetricDetailPinsTest, UnpinningWithoutAScreenTellsNobody) {
@@ -120,14 +117,12 @@ TEST_F(MetricDetailPinsTest, UnpinningWithoutAScreenTellsNobody) {
   stored(reading("LTE", "Tx Power", "power", "11"));
   pinned("LTE", "Tx Power", "power");
   opened("LTE", "Tx Power");
-  int posted = 0;
-  const auto observation = NotificationCenter::defaultCenter().observe(notification::kRemovedDashboardMetric,
-                                                                       [&](const Notification&) { ++posted; });
+  const test::PostCounter posted(notification::kRemovedDashboardMetric);
   model->updateDashboardItem(0, false, 0, false);
   screen.reset();
   settle();
   EXPECT_EQ(number("SELECT count(*) FROM Dashboard"), 0);
-  EXPECT_EQ(posted, 0);
+  EXPECT_EQ(posted.count(), 0);
 }
 
 TEST_F(MetricDetailPinsTest, ARowThatCannotBeHadIsLogged) {
@@ -157,15 +152,13 @@ TEST_F(MetricDetailPinsTest, AFailedUnpinIsLoggedAndTellsNobody) {
   stored(reading("LTE", "Tx Power", "power", "11"));
   pinned("LTE", "Tx Power", "power");
   opened("LTE", "Tx Power");
-  int posted = 0;
-  const auto observation = NotificationCenter::defaultCenter().observe(notification::kRemovedDashboardMetric,
-                                                                       [&](const Notification&) { ++posted; });
+  const test::PostCounter posted(notification::kRemovedDashboardMetric);
   const auto lock = lockDatabase();
   model->updateDashboardItem(0, false, 0, false);
   settle();
   EXPECT_TRUE(log.has(line(
       "metricDetail", "unable to delete attribute from dashboard table Prepare(message: \"database is locked\")")));
-  EXPECT_EQ(posted, 0);
+  EXPECT_EQ(posted.count(), 0);
 }
 
 }  // namespace

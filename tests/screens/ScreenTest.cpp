@@ -1,13 +1,9 @@
 #include "ScreenTest.h"
 
-#include <stdexcept>
-
-#include <sqlite3.h>
-
 #include "app/HardwareManager.h"
-#include "base/NotificationCenter.h"
 #include "intake/ZelkorWrapper.h"
 #include "shell/NotificationNames.h"
+#include "store/RawDatabase.h"
 #include "support/Reading.h"
 
 namespace quorl::test {
@@ -85,49 +81,28 @@ void ScreenTest::loses(const std::string& table) {
 }
 
 SteppedQueue& ScreenTest::databaseQueue() {
-  for (const auto& queue : platform.time.queues())
-    if (queue->label().starts_with("com.ardent.dbmanager.queue -")) return *queue;
-  throw std::runtime_error("no database");
+  return platform.time.queueLabelled("com.ardent.dbmanager.queue -");
 }
 
 namespace {
 
-std::shared_ptr<sqlite3> openFile(const std::filesystem::path& directory) {
-  sqlite3* handle = nullptr;
-  const std::string path = (directory / "metricPartV11.sqlite").string();
-  if (sqlite3_open_v2(path.c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr) != SQLITE_OK)
-    throw std::runtime_error("cannot open " + path);
-  return {handle, sqlite3_close};
-}
-
-void execute(sqlite3* handle, const std::string& text) {
-  char* message = nullptr;
-  if (sqlite3_exec(handle, text.c_str(), nullptr, nullptr, &message) == SQLITE_OK) return;
-  const std::string reason = message;
-  sqlite3_free(message);
-  throw std::runtime_error(text + ": " + reason);
+std::shared_ptr<RawDatabase> openFile(const std::filesystem::path& directory) {
+  return std::make_shared<RawDatabase>(directory / "metricPartV11.sqlite");
 }
 
 }  // namespace
 
 void ScreenTest::sql(const std::string& text) {
-  execute(openFile(platform.directory.path()).get(), text);
+  openFile(platform.directory.path())->run(text);
 }
 
 std::int64_t ScreenTest::number(const std::string& query) {
-  const auto file = openFile(platform.directory.path());
-  sqlite3_stmt* statement = nullptr;
-  if (sqlite3_prepare_v2(file.get(), query.c_str(), -1, &statement, nullptr) != SQLITE_OK ||
-      sqlite3_step(statement) != SQLITE_ROW)
-    throw std::runtime_error(query + ": " + sqlite3_errmsg(file.get()));
-  const std::int64_t value = sqlite3_column_int64(statement, 0);
-  sqlite3_finalize(statement);
-  return value;
+  return std::stoll(openFile(platform.directory.path())->column(query).at(0));
 }
 
-std::shared_ptr<sqlite3> ScreenTest::lockDatabase() {
+std::shared_ptr<RawDatabase> ScreenTest::lockDatabase() {
   auto file = openFile(platform.directory.path());
-  execute(file.get(), "BEGIN EXCLUSIVE");
+  file->run("BEGIN EXCLUSIVE");
   return file;
 }
 

@@ -2,23 +2,24 @@
 
 #include <chrono>
 #include <cstdint>
-#include <functional>
 #include <memory>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "base/NotificationCenter.h"
 #include "store/PersistanceStore.h"
 #include "support/FakePlatform.h"
 #include "support/LogRecorder.h"
 #include "support/TimeZone.h"
 
-struct sqlite3;
-
 namespace quorl::test {
+
+class RawDatabase;
 
 /// A phone in UTC and American English, 2026-01-05 09:30:12, a Monday, with the product's own store on a database file
 /// of its own.
@@ -70,7 +71,7 @@ class ScreenTest : public ::testing::Test {
   void sql(const std::string& text);
   std::int64_t number(const std::string& query);
   /// Every statement that writes fails in its step while the answer lives.
-  std::shared_ptr<sqlite3> lockDatabase();
+  std::shared_ptr<RawDatabase> lockDatabase();
 
   ScopedTimeZone zone_{"UTC"};
   ScopedLocale locale_{"en_US"};
@@ -79,6 +80,21 @@ class ScreenTest : public ::testing::Test {
   FakePlatform platform;
   LogRecorder log;
   std::shared_ptr<PersistanceStore> store;
+};
+
+/// Counts the notifications of a name that are posted while it lives.
+class PostCounter {
+ public:
+  explicit PostCounter(std::string_view name)
+      : observation_(NotificationCenter::defaultCenter().observe(name, [this](const Notification&) { ++count_; })) {}
+  PostCounter(const PostCounter&) = delete;
+  PostCounter& operator=(const PostCounter&) = delete;
+
+  int count() const { return count_; }
+
+ private:
+  int count_ = 0;
+  const NotificationCenter::Observation observation_;
 };
 
 inline LogLine line(std::string category, std::string text) {

@@ -1,4 +1,6 @@
-#include <string>
+#include <chrono>
+#include <cstdint>
+#include <ostream>
 
 #include <gtest/gtest.h>
 

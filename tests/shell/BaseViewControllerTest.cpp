@@ -1,4 +1,3 @@
-#include <fstream>
 #include <memory>
 #include <string>
 #include <vector>
@@ -8,7 +7,6 @@
 
 #include "app/AppDelegate.h"
 #include "app/ApplicationLoop.h"
-#include "app/HardwareManager.h"
 #include "shell/NotificationNames.h"
 #include "store/PersistanceStore.h"
 #include "support/FakePlatform.h"
@@ -31,11 +29,15 @@ struct Device {
 
 class BaseViewControllerTest : public ::testing::Test {
  protected:
-  BaseViewController& launchOn(const Device& device) {
+  void isDevice(const Device& device) {
     phone_.properties.texts["BasebandChipset"] = device.chipset;
     phone_.properties.booleans["InternalBuild"] = device.isInternalBuild;
     phone_.properties.booleans["CarrierInstallCapability"] = device.isCarrierBuild;
-    if (device.hasLogCapture) phone_.properties.classes = {"Sondrel"};
+    phone_.properties.classes.clear();
+    if (device.hasLogCapture) phone_.properties.classes.emplace_back("Sondrel");
+  }
+  BaseViewController& launchOn(const Device& device) {
+    isDevice(device);
     ApplicationLoop(application_).launch();
     return *application_.window()->rootViewController()->rootScreen();
   }
@@ -107,11 +109,7 @@ TEST_F(BaseViewControllerTest, ThirdTabAndExportButtonAreAsTheDeviceAllows) {
   for (const Case& each : cases) {
     test::resetSharedObjects();
     AppDelegate application;
-    phone_.properties.texts["BasebandChipset"] = each.device.chipset;
-    phone_.properties.booleans["InternalBuild"] = each.device.isInternalBuild;
-    phone_.properties.booleans["CarrierInstallCapability"] = each.device.isCarrierBuild;
-    phone_.properties.classes.clear();
-    if (each.device.hasLogCapture) phone_.properties.classes = {"Sondrel"};
+    isDevice(each.device);
     application.onLaunch();
     BaseViewController& screen = *application.window()->rootViewController()->rootScreen();
     screen.viewDidLoad();

@@ -2,7 +2,9 @@
 
 #include <algorithm>
 
+#include "app/HardwareManager.h"
 #include "base/NotificationCenter.h"
+#include "intake/ZelkorWrapper.h"
 
 namespace quorl::test {
 
@@ -117,6 +119,12 @@ std::unique_ptr<HorvaneClient> SilentTelephony::initWithQueue(Queue& /*queue*/) 
 
 std::unique_ptr<HVTelephonyNetworkInfo> SilentTelephony::networkInfo() {
   return std::make_unique<SilentNetworkInfo>();
+}
+
+void resetSharedObjects() {
+  ZelkorWrapper::resetSharedInstance();
+  HardwareManager::resetShared();
+  NotificationCenter::resetDefaultCenter();
 }
 
 FakePlatform::FakePlatform(HorvaneClientFactory* telephony)

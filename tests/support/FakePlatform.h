@@ -1,6 +1,6 @@
 #pragma once
 
-#include <deque>
+#include <filesystem>
 #include <functional>
 #include <map>
 #include <memory>

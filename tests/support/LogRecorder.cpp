@@ -1,6 +1,7 @@
 #include "support/LogRecorder.h"
 
 #include <algorithm>
+#include <mutex>
 #include <utility>
 
 namespace quorl::test {

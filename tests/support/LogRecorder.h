@@ -1,7 +1,7 @@
 #pragma once
 
+#include <cstddef>
 #include <memory>
-#include <mutex>
 #include <ostream>
 #include <string>
 #include <string_view>

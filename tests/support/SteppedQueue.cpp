@@ -1,5 +1,6 @@
 #include "support/SteppedQueue.h"
 
+#include <stdexcept>
 #include <utility>
 
 namespace quorl::test {
@@ -49,6 +50,12 @@ std::vector<std::shared_ptr<SteppedQueue>> VirtualTime::queues() const {
   for (const auto& weak : queues_)
     if (auto queue = weak.lock()) live.push_back(std::move(queue));
   return live;
+}
+
+SteppedQueue& VirtualTime::queueLabelled(std::string_view beginning) const {
+  for (const auto& queue : queues())
+    if (queue->label().starts_with(beginning)) return *queue;
+  throw std::runtime_error("no queue " + std::string(beginning));
 }
 
 void SteppedQueue::asyncAfter(Duration delay, Task task) {

@@ -1,9 +1,13 @@
 #pragma once
 
+#include <chrono>
+#include <cstddef>
 #include <deque>
 #include <map>
 #include <memory>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include "base/Clock.h"
@@ -35,6 +39,8 @@ class VirtualTime final : public Clock, public QueueFactory {
   std::shared_ptr<SteppedQueue> makeStepped(std::string label);
   /// All queues that were made and still live, in order.
   std::vector<std::shared_ptr<SteppedQueue>> queues() const;
+  /// The first of these whose label begins so. There must be one.
+  SteppedQueue& queueLabelled(std::string_view beginning) const;
 
  private:
   friend class SteppedQueue;

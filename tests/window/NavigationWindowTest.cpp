@@ -1,10 +1,7 @@
 #include <QPointer>
 #include <QQmlComponent>
 #include <memory>
-#include <string>
-#include <vector>
 
-#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "support/window/WindowFixture.h"

@@ -1,8 +1,8 @@
 #include <QAbstractItemModelTester>
-#include <QSignalSpy>
 #include <algorithm>
 #include <random>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <gmock/gmock.h>

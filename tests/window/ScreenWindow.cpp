@@ -3,10 +3,7 @@
 #include <QTest>
 #include <algorithm>
 #include <chrono>
-#include <stdexcept>
 #include <utility>
-
-#include <sqlite3.h>
 
 #include "base/DateText.h"
 #include "base/NotificationCenter.h"
@@ -15,6 +12,7 @@
 #include "shell/RootNavigationController.h"
 #include "shell/Window.h"
 #include "store/MetricStatements.h"
+#include "store/RawDatabase.h"
 #include "support/Reading.h"
 
 namespace quorl::test {
@@ -35,35 +33,19 @@ Metric ScreenWindowTest::reading(std::string metricTech, std::string metricName,
                    std::move(value), subsId);
 }
 
-std::shared_ptr<sqlite3> ScreenWindowTest::openFile() const {
-  sqlite3* handle = nullptr;
-  const std::string path = (phone.directory.path() / "metricPartV11.sqlite").string();
-  if (sqlite3_open(path.c_str(), &handle) != SQLITE_OK) throw std::runtime_error("cannot open " + path);
-  return {handle, sqlite3_close};
-}
-
-void ScreenWindowTest::sql(const std::string& text) {
-  char* message = nullptr;
-  if (sqlite3_exec(openFile().get(), text.c_str(), nullptr, nullptr, &message) == SQLITE_OK) return;
-  const std::string reason = message;
-  sqlite3_free(message);
-  throw std::runtime_error(text + ": " + reason);
+std::shared_ptr<RawDatabase> ScreenWindowTest::openFile() const {
+  return std::make_shared<RawDatabase>(phone.directory.path() / "metricPartV11.sqlite");
 }
 
 std::int64_t ScreenWindowTest::number(const std::string& query) {
-  const auto file = openFile();
-  sqlite3_stmt* statement = nullptr;
-  if (sqlite3_prepare_v2(file.get(), query.c_str(), -1, &statement, nullptr) != SQLITE_OK ||
-      sqlite3_step(statement) != SQLITE_ROW)
-    throw std::runtime_error(query + ": " + sqlite3_errmsg(file.get()));
-  const std::int64_t value = sqlite3_column_int64(statement, 0);
-  sqlite3_finalize(statement);
-  return value;
+  return std::stoll(openFile()->column(query).at(0));
 }
 
 void ScreenWindowTest::hasStored(const Metric& metric) {
-  sql(SQLTable<Metric>::createMetricTable);
-  sql("INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type, "
+  const auto file = openFile();
+  file->run(SQLTable<Metric>::createMetricTable);
+  file->run(
+      "INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type, "
       "is_attribute_graphable, metric_id, subs_id, collected_on) VALUES ('" +
       metric.metricTech + "', '" + metric.metricName + "', '" + metric.attributeNameNonLocalized + "', '" +
       metric.attributeValue + "', 'INT', " + (metric.graphable ? "1" : "0") + ", '" + metric.metricId + "', " +
@@ -71,10 +53,11 @@ void ScreenWindowTest::hasStored(const Metric& metric) {
 }
 
 void ScreenWindowTest::hasPinned(const Metric& metric) {
-  sql(SQLTable<Metric>::createDashboardTable);
-  sql("INSERT INTO Dashboard (metric_tech, metric_id, metric_name, attribute_name, subs_id) VALUES ('" +
-      metric.metricTech + "', '" + metric.metricId + "', '" + metric.metricName + "', '" +
-      metric.attributeNameNonLocalized + "', " + std::to_string(metric.subsId) + ")");
+  const auto file = openFile();
+  file->run(SQLTable<Metric>::createDashboardTable);
+  file->run("INSERT INTO Dashboard (metric_tech, metric_id, metric_name, attribute_name, subs_id) VALUES ('" +
+            metric.metricTech + "', '" + metric.metricId + "', '" + metric.metricName + "', '" +
+            metric.attributeNameNonLocalized + "', " + std::to_string(metric.subsId) + ")");
 }
 
 void ScreenWindowTest::hasADashboard() {
@@ -115,16 +98,14 @@ void ScreenWindowTest::opens(const std::string& metricName) {
   pass(600ms);
 }
 
-std::shared_ptr<sqlite3> ScreenWindowTest::lockDatabase() {
+std::shared_ptr<RawDatabase> ScreenWindowTest::lockDatabase() {
   auto file = openFile();
-  EXPECT_EQ(sqlite3_exec(file.get(), "BEGIN EXCLUSIVE", nullptr, nullptr, nullptr), SQLITE_OK);
+  file->run("BEGIN EXCLUSIVE");
   return file;
 }
 
 SteppedQueue& ScreenWindowTest::databaseQueue() {
-  for (const auto& queue : phone.time.queues())
-    if (queue->label().starts_with("com.ardent.dbmanager.queue -")) return *queue;
-  throw std::runtime_error("no database");
+  return phone.time.queueLabelled("com.ardent.dbmanager.queue -");
 }
 
 QQuickItem* ScreenWindowTest::row(const QString& objectName, const std::string& name) {

@@ -13,9 +13,9 @@
 #include "support/TimeZone.h"
 #include "support/window/WindowFixture.h"
 
-struct sqlite3;
-
 namespace quorl::test {
+
+class RawDatabase;
 
 /// The product in its window on a phone in UTC and American English, with rows of an earlier run and rows that arrive.
 /// The clock starts beside the machine's, as SQLite works out limits by that.
@@ -66,7 +66,8 @@ class ScreenWindowTest : public WindowTest {
   /// Opens a row of the metric list, which is on show.
   void opens(const std::string& metricName);
   /// Every statement that writes fails while the answer lives.
-  std::shared_ptr<sqlite3> lockDatabase();
+  std::shared_ptr<RawDatabase> lockDatabase();
+  /// The queue on which the store's statements run.
   SteppedQueue& databaseQueue();
 
   // What is on show.
@@ -89,8 +90,7 @@ class ScreenWindowTest : public WindowTest {
     window().grabWindow();
     WindowTest::settle();
   }
-  std::shared_ptr<sqlite3> openFile() const;
-  void sql(const std::string& text);
+  std::shared_ptr<RawDatabase> openFile() const;
 
   ScopedTimeZone zone_{"UTC"};
   ScopedLocale locale_{"en_US"};

@@ -17,7 +17,6 @@ namespace {
 
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
-using namespace std::chrono_literals;
 
 std::vector<std::string> column(const QAbstractItemModel& model, int role) {
   std::vector<std::string> values;

@@ -1,14 +1,11 @@
+#include <QColor>
 #include <QFont>
 #include <cmath>
-#include <memory>
 #include <string>
-#include <vector>
 
-#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "app/HardwareManager.h"
-#include "base/Log.h"
 #include "hosts/simulator/TelephonyScript.h"
 #include "shell/view/Appearance.h"
 #include "support/window/WindowFixture.h"
@@ -16,10 +13,6 @@
 namespace quorl {
 namespace {
 
-using ::testing::Each;
-using ::testing::ElementsAre;
-using ::testing::Ge;
-using ::testing::HasSubstr;
 using namespace std::chrono_literals;
 namespace event = simulator::telephony_event;
 
@@ -173,7 +166,6 @@ TEST_F(ShellWindowTest, AnUnknownChipsetPutsTheDialogOverTheRunningShell) {
 }
 
 TEST_F(ShellWindowTest, DoneEndsTheProcessOfAnUnknownChipset) {
-  GTEST_FLAG_SET(death_test_style, "threadsafe");
   GTEST_FLAG_SET(death_test_style, "threadsafe");
   phone.properties.texts.erase("BasebandChipset");
   launch();

@@ -1,5 +1,4 @@
 #include <string>
-#include <variant>
 #include <vector>
 
 #include <gtest/gtest.h>

@@ -31,8 +31,8 @@ class UtcTextWriter {
     const auto day = std::chrono::floor<std::chrono::days>(seconds);
     if (day != day_ || dayText_.empty()) {
       day_ = day;
-      const std::string text = utcText(date);
-      dayText_ = text.substr(0, text.find(' '));
+      dayText_ = utcText(date);
+      dayText_.erase(dayText_.find(' '));
     }
     const std::int64_t second = (seconds - day).count();
     std::array<char, 9> clock;  // " 09:30:12"

@@ -2,12 +2,14 @@
 
 #include <QAnimationDriver>
 #include <QCoreApplication>
+#include <QPoint>
 #include <QSignalSpy>
 #include <QStyleHints>
 #include <QTest>
 #include <QVariantAnimation>
 #include <algorithm>
 #include <fstream>
+#include <functional>
 #include <mutex>
 #include <stdexcept>
 #include <utility>

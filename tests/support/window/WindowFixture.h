@@ -1,19 +1,15 @@
 #pragma once
 
-#include <QColor>
 #include <QGuiApplication>
 #include <QImage>
-#include <QObject>
-#include <QPoint>
 #include <QQmlApplicationEngine>
 #include <QQuickItem>
 #include <QQuickWindow>
+#include <QSize>
 #include <QString>
 #include <chrono>
-#include <functional>
 #include <memory>
 #include <string>
-#include <string_view>
 #include <vector>
 
 #include <gtest/gtest.h>

@@ -66,7 +66,11 @@ QVariant MetricDetailsListModel::data(const QModelIndex& index, int role) const 
 }
 
 QHash<int, QByteArray> MetricDetailsListModel::roleNames() const {
-  return {{SectionRole, "section"}, {NameRole, "name"}, {ValueRole, "value"}, {BookmarkedRole, "bookmarked"}, {GraphRole, "showsGraph"}};
+  return {{SectionRole, "section"},
+          {NameRole, "name"},
+          {ValueRole, "value"},
+          {BookmarkedRole, "bookmarked"},
+          {GraphRole, "showsGraph"}};
 }
 
 }  // namespace quorl::view
