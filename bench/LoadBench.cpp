@@ -36,6 +36,7 @@
 #include "base/Log.h"
 #include "base/NotificationCenter.h"
 #include "hosts/simulator/Configuration.h"
+#include "hosts/simulator/EpochTime.h"
 #include "hosts/simulator/LiveScenario.h"
 #include "hosts/simulator/PhoneServices.h"
 #include "hosts/simulator/ScenarioFiles.h"
@@ -228,8 +229,7 @@ class Expectation {
     if (!configuration) std::abort();
     CountingStore store;
     const auto service = MetricService::make(store, ZelkorWrapper::sharedInstance());
-    const auto startMs = std::chrono::duration_cast<milliseconds>(start.time_since_epoch()).count();
-    simulator::ScenarioRun run(choice, static_cast<std::uint64_t>(startMs));
+    simulator::ScenarioRun run(choice, simulator::millisecondsSince1970(start));
     Expected expected;
     for (milliseconds passed{0}; passed < length; passed += 1s)
       run.advance(1s, [&](const simulator::RecordedEvent& event) {

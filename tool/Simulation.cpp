@@ -10,6 +10,7 @@
 #include "ProductRun.h"
 #include "RowCounter.h"
 #include "ToolLog.h"
+#include "hosts/simulator/EpochTime.h"
 #include "hosts/simulator/RecordingWriter.h"
 #include "hosts/simulator/SimulatedPhone.h"
 
@@ -46,8 +47,7 @@ tl::expected<RecordedScenario, std::string> recordScenario(simulator::ScenarioCh
   auto writer = RecordingWriter::open(file);
   if (!writer) return tl::unexpected(std::move(writer.error()));
   const auto begin = std::chrono::steady_clock::now();
-  const auto startMs = std::chrono::duration_cast<milliseconds>(start.time_since_epoch()).count();
-  simulator::ScenarioRun run(std::move(choice), static_cast<std::uint64_t>(startMs));
+  simulator::ScenarioRun run(std::move(choice), simulator::millisecondsSince1970(start));
   inPortions(length, progress, [&](milliseconds portion) {
     run.advance(portion, [&writer](const simulator::RecordedEvent& event) { writer->write(event); });
   });

@@ -1,7 +1,9 @@
 #include "recording/RecordingMaker.h"
 
 #include <algorithm>
+#include <utility>
 
+#include "hosts/simulator/Configuration.h"
 #include "recording/EventKinds.h"
 
 namespace quorl::tool {
@@ -44,7 +46,6 @@ std::vector<Moment> schedule(BasebandFamily family, RadioWorld& world) {
 
 std::vector<simulator::RecordedEvent> makeRecording(BasebandFamily family, std::uint64_t seed) {
   constexpr std::int64_t kTriggerRef = 9999;
-  constexpr std::int64_t kApplication = 2;
   RadioWorld world(seed);
   std::vector<simulator::RecordedEvent> events;
   for (const Moment& moment : schedule(family, world)) {
@@ -55,7 +56,7 @@ std::vector<simulator::RecordedEvent> makeRecording(BasebandFamily family, std::
     event.payload = moment.kind->make(world);
     event.triggerRef = kTriggerRef;
     event.profileID = 0;
-    event.appID = kApplication;
+    event.appID = simulator::Configuration::kApplicationId;
     events.push_back(std::move(event));
   }
   return events;

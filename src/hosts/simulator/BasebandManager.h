@@ -12,7 +12,7 @@
 
 namespace quorl::simulator {
 
-/// A client asks for all its current metrics.
+/// A client asks for the current values of metrics: of one, or of all in its configuration.
 struct SnapshotRequest {
   std::vector<std::int64_t> metrics;  // the ids it wants, in the order of its configuration
   std::int64_t triggerRef = 0;        // comes back with each event

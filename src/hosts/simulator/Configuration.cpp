@@ -1,7 +1,6 @@
 #include "hosts/simulator/Configuration.h"
 
 #include <algorithm>
-#include <limits>
 #include <optional>
 #include <string>
 #include <utility>

@@ -5,6 +5,7 @@
 #include <cmath>
 #include <utility>
 
+#include "hosts/simulator/EpochTime.h"
 #include "hosts/simulator/TelephonyFeed.h"
 
 namespace quorl::simulator {
@@ -15,10 +16,6 @@ using std::chrono::milliseconds;
 constexpr milliseconds kStep{50};
 /// A machine that slept, or a clock that was set, does not make the world run after it.
 constexpr double kLongestStepMs = 1000;
-
-std::uint64_t millisecondsSince1970(Date date) {
-  return static_cast<std::uint64_t>(std::chrono::duration_cast<milliseconds>(date.time_since_epoch()).count());
-}
 
 }  // namespace
 

@@ -1,10 +1,10 @@
 #pragma once
 
 #include <filesystem>
-#include <mutex>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "base/Queue.h"

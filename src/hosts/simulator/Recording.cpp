@@ -2,7 +2,6 @@
 
 #include <cerrno>
 #include <fstream>
-#include <limits>
 #include <system_error>
 #include <utility>
 

@@ -2,12 +2,13 @@
 
 #include <utility>
 
+#include "hosts/simulator/Configuration.h"
+
 namespace quorl::simulator {
 namespace {
 
 constexpr std::int64_t kTriggerRef = 9999;
 constexpr std::int64_t kProfile = 0;
-constexpr std::int64_t kApplication = 2;
 
 metrics::MetricReporter::Sink delivering(const ScenarioRun::Sink& sink) {
   return [&sink](metrics::ReportedMetric metric) {
@@ -17,7 +18,7 @@ metrics::MetricReporter::Sink delivering(const ScenarioRun::Sink& sink) {
     event.payload = std::move(metric.payload);
     event.triggerRef = kTriggerRef;
     event.profileID = kProfile;
-    event.appID = kApplication;
+    event.appID = Configuration::kApplicationId;
     sink(std::move(event));
   };
 }

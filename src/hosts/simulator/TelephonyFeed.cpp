@@ -63,22 +63,22 @@ HVCellInfo TelephonyFeed::cellInfo(const network::SubscriptionState& state) {
   const network::CellMeasurement& measurement = state.serving->best;
   const network::Cell& cell = *measurement.cell;
   const std::string technology = nameOf(cell.technology);
-  const bool hasAreaCode = cell.technology == Technology::Lte || cell.technology == Technology::Nr;
+  const bool isPacket = network::isPacketCell(cell.technology);
   HVCellDictionary dictionary{
       {"kHVCellMonitorCellType", "kHVCellMonitorCellTypeServing"},
       {"kHVCellMonitorRadioAccessTechnology", "kHVCellMonitorRadioAccessTechnology" + technology},
       {"kHVCellMonitorCellRadioAccessTechnology", technology},
       {"kHVCellMonitorMCC", std::int64_t{cell.plmn.mcc}},
       {"kHVCellMonitorMNC", std::int64_t{cell.plmn.mnc}},
-      {hasAreaCode ? "kHVCellMonitorTAC" : "kHVCellMonitorLAC", std::int64_t{cell.areaCode}},
+      {isPacket ? "kHVCellMonitorTAC" : "kHVCellMonitorLAC", std::int64_t{cell.areaCode}},
       {"kHVCellMonitorCellId", static_cast<std::int64_t>(cell.cellId)},
       {"kHVCellMonitorBandInfo", std::int64_t{cell.band}},
   };
-  if (hasAreaCode) dictionary.emplace_back("kHVCellMonitorBandwidth", std::int64_t{cell.resourceBlocks});
+  if (isPacket) dictionary.emplace_back("kHVCellMonitorBandwidth", std::int64_t{cell.resourceBlocks});
   dictionary.emplace_back("kHVCellMonitorUARFCN", std::int64_t{cell.downlinkChannel});
   dictionary.emplace_back("kHVCellMonitorDeploymentType", state.nr ? kNonStandAlone : std::int64_t{0});
   dictionary.emplace_back("kHVCellMonitorRSRP", whole(measurement.power));
-  if (hasAreaCode) dictionary.emplace_back("kHVCellMonitorRSRQ", whole(measurement.quality));
+  if (isPacket) dictionary.emplace_back("kHVCellMonitorRSRQ", whole(measurement.quality));
   info.legacyInfo.emplace().emplace_back(std::move(dictionary));
   return info;
 }

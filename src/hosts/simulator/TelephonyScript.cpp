@@ -1,12 +1,10 @@
 #include "hosts/simulator/TelephonyScript.h"
 
 #include <algorithm>
-#include <array>
 #include <cerrno>
 #include <cstdint>
 #include <fstream>
 #include <initializer_list>
-#include <limits>
 #include <system_error>
 #include <utility>
 

@@ -17,27 +17,7 @@
 //
 //   {"atMs": 0, "event": "simInserted", "slot": 1, "carrier": "Testnet One"}
 //
-// Every line has "atMs" (whole milliseconds from the start of the run, 0 to 30 days) and "event". Lines need no order;
-// lines of one time happen in the order of the file. Those of time 0 are how the phone is found at the start. Blank
-// lines are skipped. The events and their fields:
-//
-//   simInserted   slot, carrier (text; left out or null: no name yet)    SIM comes, cell monitor update
-//   simRemoved    slot                                                   SIM goes, cell monitor update
-//   carrierName   slot, name (text or null)                              the carrier map's name
-//   carrierMap    present (boolean)                                      whether there is a carrier map at all
-//   cell          slot, info (object, or null for none),                 cell of the slot, and a cell monitor update
-//                 update (boolean, true if left out)                     unless `update` is false
-//   signal        slot, rsrp (dBm, or null for none)                     measurements
-//   bands         slot, active, supported (object of number lists,       band record
-//                 or null or left out for none)
-//   fail          what, error (text), slot                               what answers with this error from now on
-//   recover       what, slot                                             what answers again
-//   connection    slot, type, status                                     connection state change
-//
-// "slot" is 1 or 2. "what" is "subscriptions" (without slot), "cell", "signal" or "bands". Entries of "info" keep the
-// order of the file; whole numbers and texts stand for themselves, any other value for one of a kind that the product
-// does not know. "type" is Default, Internet, Ims or Other; "status" is Unknown, Disconnected, Connecting, Connected or
-// Disconnecting.
+// The form is told in docs/telephony-script.md.
 
 namespace quorl::simulator {
 

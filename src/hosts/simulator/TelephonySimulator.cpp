@@ -1,11 +1,9 @@
 #include "hosts/simulator/TelephonySimulator.h"
 
-#include <algorithm>
 #include <array>
 #include <functional>
 #include <map>
 #include <mutex>
-#include <type_traits>
 
 #include "telephony/CarrierInfoObject.h"
 

@@ -1,13 +1,13 @@
 #include "hosts/simulator/TimeShift.h"
 
 #include <algorithm>
-#include <chrono>
 #include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
 
 #include "hosts/simulator/CatalogueClass.h"
+#include "hosts/simulator/EpochTime.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MessageTable.h"
 #include "messages/MetricCodable.h"
@@ -84,8 +84,7 @@ void shiftToNow(std::vector<RecordedEvent>& events, Date now) {
   for (const RecordedEvent& event : events)
     if (const auto timestamp = timestampOf(event)) latest = std::max(latest.value_or(0), *timestamp);
   if (!latest) return;
-  const auto nowMs =
-      static_cast<std::uint64_t>(std::chrono::duration_cast<std::chrono::milliseconds>(now.time_since_epoch()).count());
+  const std::uint64_t nowMs = millisecondsSince1970(now);
   for (RecordedEvent& event : events) {
     const auto timestamp = timestampOf(event);
     if (!timestamp) continue;

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "base/DateText.h"
+#include "hosts/simulator/EpochTime.h"
 #include "hosts/simulator/history/BulkIntake.h"
 
 namespace quorl::simulator {
@@ -38,8 +39,7 @@ std::vector<std::int64_t> currentMetrics(metrics::Family family) {
 bool playSession(const HistoryPlan& plan, std::uint64_t number, Date start, BulkIntake& intake) {
   ScenarioChoice choice = plan.choice;
   choice.seed += number;
-  const auto startMs = std::chrono::duration_cast<milliseconds>(start.time_since_epoch()).count();
-  ScenarioRun run(std::move(choice), static_cast<std::uint64_t>(startMs));
+  ScenarioRun run(std::move(choice), millisecondsSince1970(start));
   bool isGood = true;
   const auto take = [&](const RecordedEvent& event) { isGood = isGood && intake.take(event); };
   const milliseconds length =

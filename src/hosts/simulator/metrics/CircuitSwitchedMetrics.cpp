@@ -154,8 +154,7 @@ void setCallCell(CellularCallEndDetails& message, const Call& call) {
   if (call.cell == nullptr) return;
   const Cell& cell = *call.cell;
   setNetwork(message, cell.plmn);
-  const bool isNewer = call.technology == Technology::Lte || call.technology == Technology::Nr;
-  if (isNewer) {
+  if (network::isPacketCell(call.technology)) {
     message.setLteCellId(u32(cell.cellId));
     message.setLteLac(cell.areaCode);
   } else {

@@ -1,9 +1,10 @@
 #include "hosts/simulator/metrics/MetricFields.h"
 
 #include <algorithm>
-#include <array>
+#include <iterator>
 #include <string>
 
+#include "hosts/simulator/network/RandomStream.h"
 #include "messages/classes/shared_enums.h"
 #include "messages/wire/WireWriter.h"
 
@@ -16,12 +17,9 @@ using network::Technology;
 
 namespace {
 
-/// SplitMix64: every bit of the answer depends on every bit of the number.
-constexpr std::uint64_t scattered(std::uint64_t number) {
-  number += 0x9E3779B97F4A7C15U;
-  number = (number ^ (number >> 30U)) * 0xBF58476D1CE4E5B9U;
-  number = (number ^ (number >> 27U)) * 0x94D049BB133111EBU;
-  return number ^ (number >> 31U);
+/// Every bit of the answer depends on every bit of the number, and 0 does not stay 0.
+std::uint64_t scattered(std::uint64_t number) {
+  return network::mixed(number + 0x9E3779B97F4A7C15U);
 }
 
 struct LteWidth {
@@ -102,8 +100,7 @@ const ServingMeasurement* nrServing(const SubscriptionState& state) {
 }
 
 bool isConnected(const SubscriptionState& state) {
-  return state.rrc == network::RrcState::Connected || state.rrc == network::RrcState::CellDch ||
-         state.rrc == network::RrcState::CellFach;
+  return network::isConnectedState(state.rrc);
 }
 
 std::uint32_t resourceBlocks(const Cell& cell) {

@@ -14,8 +14,8 @@ namespace quorl::simulator::metrics {
 
 using Payload = std::optional<ByteString>;
 
-constexpr std::size_t kMostNeighbours = 8;  // of a technology in one metric
-constexpr std::int32_t kMostLtePower = 23;  // dBm, power class 3
+inline constexpr std::size_t kMostNeighbours = 8;  // of a technology in one metric
+inline constexpr std::int32_t kMostLtePower = 23;  // dBm, power class 3
 
 /// What a finished message is on the wire.
 ByteString payload(const MetricCodable& message);

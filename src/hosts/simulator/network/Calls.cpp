@@ -1,7 +1,5 @@
 #include "hosts/simulator/network/Calls.h"
 
-#include <algorithm>
-
 namespace quorl::simulator::network {
 namespace {
 

@@ -1,7 +1,6 @@
 #include "hosts/simulator/network/Carriers.h"
 
 #include <algorithm>
-#include <utility>
 
 namespace quorl::simulator::network {
 namespace {
@@ -56,12 +55,11 @@ void Carriers::account() {
 
 void Carriers::measureCarriers() {
   SubscriptionState& state = core_.state;
-  bool hasChanged = false;
   for (SecondaryCarrier& carrier : state.carriers) carrier.serving = core_.receiver.serve(*carrier.serving.best.cell);
   const std::size_t before = state.carriers.size();
   std::erase_if(state.carriers,
                 [](const SecondaryCarrier& carrier) { return carrier.serving.best.power < kCarrierDrop; });
-  hasChanged = state.carriers.size() != before;
+  bool hasChanged = state.carriers.size() != before;
   if (state.isDataActive) {
     quietSinceMs_ = core_.now();
     configureCarriers();

@@ -2,8 +2,6 @@
 
 #include <algorithm>
 
-#include "hosts/simulator/network/LinkAdaptation.h"
-
 namespace quorl::simulator::network {
 namespace {
 
@@ -189,7 +187,7 @@ void Connection::begin(RrcCause cause) {
 void Connection::connectedDrx(bool isConnected) {
   DrxConfiguration drx;
   drx.pagingCycleMs = core_.state.technology == Technology::Umts ? 640 : 1280;
-  if (isConnected && (core_.state.technology == Technology::Lte || core_.state.technology == Technology::Nr)) {
+  if (isConnected && isPacketCell(core_.state.technology)) {
     drx.isConnectedDrx = true;
     drx.onDurationMs = 10;
     drx.inactivityMs = 100;
@@ -210,8 +208,8 @@ void Connection::letGo() {
 }
 
 void Connection::touch() {
-  const bool isSlow = core_.state.technology == Technology::Lte || core_.state.technology == Technology::Nr;
-  if (core_.isConnected()) core_.after(Timer::Inactivity, isSlow ? kInactivityMs : kInactivityMs / 2);
+  const bool isPacket = isPacketCell(core_.state.technology);
+  if (core_.isConnected()) core_.after(Timer::Inactivity, isPacket ? kInactivityMs : kInactivityMs / 2);
 }
 
 void Connection::releaseAfter(SimulatedMs milliseconds) {
@@ -267,8 +265,7 @@ void Connection::release(RrcCause cause) {
   for (RadioUser* user : core_.users) user->connectionEnding(cause);
   core_.say(Kind::ConnectionRelease, false, 1, target_ != nullptr ? 12 : 4);
   cause_ = cause;
-  const bool isSlow = core_.state.technology == Technology::Lte || core_.state.technology == Technology::Nr;
-  if (isSlow) camping_.enter(RrcState::Closing, cause);
+  if (isPacketCell(core_.state.technology)) camping_.enter(RrcState::Closing, cause);
   core_.after(Timer::Release, core_.delay(20, 60));
 }
 
@@ -326,7 +323,7 @@ void Connection::reestablish(RrcCause cause) {
   core_.cancel(Timer::Inactivity);
   cause_ = cause;
   searchUntilMs_ = core_.now() + kSearchMs;
-  if (core_.state.technology != Technology::Lte && core_.state.technology != Technology::Nr) {
+  if (!isPacketCell(core_.state.technology)) {
     end(event::ConnectionEnd::Failure, RrcCause::ReleaseLinkFailure);
     return;
   }

@@ -27,7 +27,7 @@ class Connection {
   void release(RrcCause cause);
   /// Ends it and goes to another cell in idle.
   void redirect(const Cell& target);
-  /// Goes on on another cell, by handover. `isOtherTechnology`: with the states of the new one.
+  /// Goes on on another cell, by handover; on one of another technology with that one's states.
   void moveTo(const Cell& target);
   /// The radio link is gone: looks for a cell to go on.
   void reestablish(RrcCause cause);

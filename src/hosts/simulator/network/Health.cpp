@@ -67,8 +67,7 @@ void Health::judgeLink() {
 
 void Health::watchFloor() {
   const SubscriptionState& state = core_.state;
-  const bool isPacket = state.technology == Technology::Lte || state.technology == Technology::Nr;
-  const bool isLow = isPacket && state.serving && state.serving->best.power < -12000;
+  const bool isLow = isPacketCell(state.technology) && state.serving && state.serving->best.power < -12000;
   if (!isLow) {
     floorSinceMs_ = core_.now();
     isFloorTold_ = false;

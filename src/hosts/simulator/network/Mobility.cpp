@@ -19,7 +19,7 @@ constexpr std::uint32_t kN310 = 3;
 constexpr std::uint32_t kN311 = 2;
 
 /// TS 36.133 7.6: the control channel fails in a tenth of the cases below about -8 dB, in a fiftieth above -6 dB.
-bool isOut(const CellMeasurement& measurement) {
+bool isOutOfSync(const CellMeasurement& measurement) {
   switch (measurement.cell->technology) {
     case Technology::Umts:
       return measurement.quality < -2000 || measurement.power < -11800;
@@ -33,15 +33,15 @@ bool isOut(const CellMeasurement& measurement) {
   }
   return true;
 }
-bool isIn(const CellMeasurement& measurement) {
-  return !isOut(measurement) && (!isPacketCell(measurement.cell->technology) || measurement.sinr > -600);
+bool isInSync(const CellMeasurement& measurement) {
+  return !isOutOfSync(measurement) && (!isPacketCell(measurement.cell->technology) || measurement.sinr > -600);
+}
+
+SimulatedMs timeToTrigger(Trigger trigger) {
+  return trigger == Trigger::A3 ? 320 : 640;
 }
 
 }  // namespace
-
-SimulatedMs Mobility::timeToTrigger(Trigger trigger) const {
-  return trigger == Trigger::A3 ? 320 : 640;
-}
 
 void Mobility::measured() {
   if (core_.cell() == nullptr || !core_.isConnected()) return;
@@ -51,10 +51,10 @@ void Mobility::measured() {
 
 void Mobility::superviseLink() {
   const CellMeasurement& serving = core_.state.serving->best;
-  if (isOut(serving)) {
+  if (isOutOfSync(serving)) {
     inSync_ = 0;
     if (++outOfSync_ >= kN310 && !core_.isRunning(Timer::OutOfSync)) core_.after(Timer::OutOfSync, kT310Ms);
-  } else if (isIn(serving)) {
+  } else if (isInSync(serving)) {
     outOfSync_ = 0;
     if (++inSync_ >= kN311) core_.cancel(Timer::OutOfSync);
   }
@@ -189,19 +189,20 @@ void Mobility::executed() {
   core_.say(Kind::ReconfigurationComplete, true, 1, 2);
 }
 
-void Mobility::cellChanged(const Cell*, const Cell*) {
+void Mobility::forgetMeasurements() {
   candidates_.clear();
   outOfSync_ = 0;
   inSync_ = 0;
   core_.cancel(Timer::OutOfSync);
 }
 
+void Mobility::cellChanged(const Cell*, const Cell*) {
+  forgetMeasurements();
+}
+
 void Mobility::connectionEnding(RrcCause) {
   pending_ = {};
-  candidates_.clear();
-  outOfSync_ = 0;
-  inSync_ = 0;
-  core_.cancel(Timer::OutOfSync);
+  forgetMeasurements();
 }
 
 }  // namespace quorl::simulator::network

@@ -35,7 +35,7 @@ class Mobility final : public RadioUser {
   bool callsFor(const CellMeasurement& candidate, event::HandoverTrigger& trigger) const;
   void report(const CellMeasurement& target, event::HandoverTrigger trigger);
   void fail(event::LinkFailureReason reason);
-  SimulatedMs timeToTrigger(event::HandoverTrigger trigger) const;
+  void forgetMeasurements();
 
   SubscriptionCore& core_;
   Connection& connection_;

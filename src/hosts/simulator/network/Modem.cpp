@@ -2,9 +2,8 @@
 
 #include <algorithm>
 #include <array>
-#include <limits>
-#include <type_traits>
 #include <utility>
+#include <variant>
 
 #include "hosts/simulator/network/Arithmetic.h"
 #include "hosts/simulator/network/Route.h"
@@ -13,7 +12,7 @@
 namespace quorl::simulator::network {
 namespace {
 
-constexpr SimulatedMs kNever = std::numeric_limits<SimulatedMs>::max();
+constexpr SimulatedMs kNever = SubscriptionCore::kNever;
 
 }  // namespace
 
@@ -137,7 +136,7 @@ class Modem::World {
     subscriptions_[stall.subscription].data().stall(stall.seconds, stall.isDnsFailure);
   }
   void perform(const action::MetricTraffic& traffic) {
-    const event::Cue cue{static_cast<event::CueKind>(traffic.kind), traffic.count, traffic.bytes};
+    const event::Cue cue{traffic.kind, traffic.count, traffic.bytes};
     (*listener_)(ModemEvent{phone_.nowMs, 0, cue}, subscriptions_[0].state());
   }
 

@@ -1,8 +1,6 @@
 #pragma once
 
 #include <cstdint>
-#include <optional>
-#include <string>
 #include <variant>
 
 #include "hosts/simulator/network/Cell.h"

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <array>
+#include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -28,6 +29,11 @@ enum class RrcState : std::uint8_t {
   UraPch,
 };
 inline constexpr std::size_t kRrcStates = 10;
+
+/// A connection stands that carries signalling and data.
+constexpr bool isConnectedState(RrcState state) {
+  return state == RrcState::Connected || state == RrcState::CellDch || state == RrcState::CellFach;
+}
 
 /// Why a connection was set up, re-established or ended; a subset of TS 36.331 and TS 25.331.
 enum class RrcCause : std::uint8_t {

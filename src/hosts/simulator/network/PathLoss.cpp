@@ -7,7 +7,6 @@
 namespace quorl::simulator::network {
 namespace {
 
-constexpr double kPhoneHeight = 1.5;
 constexpr double kLightMetresPerNanosecond = 0.299792458;
 // Rural: buildings of 5 m, streets of 20 m. 5 to the 1.72 is 15.93.
 constexpr double kRuralDistanceTerm = 0.03 * 15.93;

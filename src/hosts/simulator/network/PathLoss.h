@@ -4,7 +4,9 @@
 
 namespace quorl::simulator::network {
 
-/// Loss between a site and a phone 1.5 m above the ground, TR 38.901 clause 7.4. What depends on the carrier alone is
+inline constexpr double kPhoneHeight = 1.5;  // metres above the ground
+
+/// Loss between a site and a phone at `kPhoneHeight`, TR 38.901 clause 7.4. What depends on the carrier alone is
 /// computed once.
 class PathLoss {
  public:

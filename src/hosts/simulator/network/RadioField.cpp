@@ -45,7 +45,7 @@ void RadioField::buildMasts(Field& field, std::uint8_t operatorIndex, const Scen
     Mast mast;
     mast.x = first.x;
     mast.y = first.y;
-    mast.drop = first.height - 1.5;
+    mast.drop = first.height - kPhoneHeight;
     mast.zones = zonesAt(first.x, first.y);
     mast.shadow = shadows_.normal();
     mast.sight = shadows_.normal();
@@ -146,9 +146,9 @@ void RadioField::fillMast(Field& field, const Mast& mast, const Surroundings& pl
       if (beams > 1) {
         // Beams share the 120 degrees of the sector evenly; each falls off by 3 dB towards the next.
         const double width = 120.0 / beams;
-        const double place01 = std::clamp((degrees + 60.0) / width, 0.0, beams - 0.001);
-        received.beam = static_cast<std::uint8_t>(place01);
-        const double aside = 2.0 * (place01 - received.beam - 0.5);
+        const double beamPosition = std::clamp((degrees + 60.0) / width, 0.0, beams - 0.001);
+        received.beam = static_cast<std::uint8_t>(beamPosition);
+        const double aside = 2.0 * (beamPosition - received.beam - 0.5);
         received.power += kBeamGain - 3.0 * aside * aside;
       }
       received.power = std::min(received.power, sector.elementPower / 100.0 - kLeastCouplingLoss);

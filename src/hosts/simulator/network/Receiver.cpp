@@ -116,7 +116,7 @@ Receiver::Receiver(const Network& network, RadioField& field, std::uint64_t seed
       antennas_(seed, 10U + subscription),
       heard_(network.cells().size()),
       channelPower_(network.channels()),
-      channelDisturb_(network.channels()),
+      channelInterference_(network.channels()),
       heardOn_(network.channels()) {
   for (const Cell& cell : network.cells()) noise_.push_back(fromDecibels(noiseOf(cell)));
 }
@@ -126,7 +126,7 @@ void Receiver::listen(const std::vector<std::uint8_t>& operators, const Surround
   nowMs_ = nowMs;
   load_ = load;
   std::fill(channelPower_.begin(), channelPower_.end(), 0.0);
-  std::fill(channelDisturb_.begin(), channelDisturb_.end(), 0.0);
+  std::fill(channelInterference_.begin(), channelInterference_.end(), 0.0);
   for (auto& list : heardOn_) list.clear();
   // Filter coefficient 4 of TS 36.331 for a connection; rounds in idle are six times as far apart.
   const double share = isConnected ? 0.5 : 0.8;
@@ -146,7 +146,7 @@ void Receiver::hear(const RadioField::Received& received, double share) {
   const Cell& cell = network_.cell(received.cell);
   const std::uint16_t channel = network_.sector(received.cell).channelIndex;
   channelPower_[channel] += heard.linear * occupancy(cell.technology, load_);
-  channelDisturb_[channel] += heard.linear * (0.1 + 0.9 * load_);
+  channelInterference_[channel] += heard.linear * (0.1 + 0.9 * load_);
   if (heard.power > kWeakestFound) heardOn_[channel].push_back(received.cell);
 }
 
@@ -186,7 +186,7 @@ CellMeasurement Receiver::measure(const Cell& cell) const {
   result.power = within(power, powers);
 
   const double own = isHeard ? linear * (0.1 + 0.9 * load_) : 0.0;
-  const double disturbance = std::max(0.0, channelDisturb_[channel] - own) + noise;
+  const double disturbance = std::max(0.0, channelInterference_[channel] - own) + noise;
   result.sinr = within(-toDecibels(disturbance / linear + kOwnDistortion), kSinrRange);
 
   const double received = channelPower_[channel] + noise;

@@ -2,11 +2,11 @@
 
 #include <array>
 #include <cstdint>
-#include <optional>
 #include <vector>
 
 #include "hosts/simulator/network/Network.h"
 #include "hosts/simulator/network/RadioField.h"
+#include "hosts/simulator/network/RandomStream.h"
 
 namespace quorl::simulator::network {
 
@@ -43,10 +43,10 @@ class Receiver {
   const Network& network_;
   RadioField& field_;
   RandomStream antennas_;
-  std::vector<double> noise_;           // by cell, mW
-  std::vector<Heard> heard_;            // by cell
-  std::vector<double> channelPower_;    // by channel: sum of power and use, mW
-  std::vector<double> channelDisturb_;  // by channel: sum of what disturbs others, mW
+  std::vector<double> noise_;                // by cell, mW
+  std::vector<Heard> heard_;                 // by cell
+  std::vector<double> channelPower_;         // by channel: sum of power and use, mW
+  std::vector<double> channelInterference_;  // by channel: sum of what disturbs others, mW
   std::array<std::vector<CellMeasurement>, 5> found_;
   std::array<double, 4> antennaState_{};
   std::vector<std::vector<std::uint16_t>> heardOn_;  // by channel, while cells are looked for

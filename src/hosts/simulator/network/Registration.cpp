@@ -13,8 +13,9 @@ constexpr std::uint32_t kT3312Seconds = 3240;
 constexpr std::uint8_t kPlmnNotAllowed = 11;
 constexpr SimulatedMs kT3411Ms = 10000;
 
+/// Tracking areas come in lists; a location or routing area stands alone.
 bool hasAreaList(Technology technology) {
-  return technology == Technology::Lte || technology == Technology::Nr;
+  return isPacketCell(technology);
 }
 
 }  // namespace
@@ -80,7 +81,7 @@ void Registration::check() {
 
 void Registration::periodicUpdateDue() {
   if (core_.state.registration.state != RegistrationState::Registered || core_.cell() == nullptr) return;
-  core_.after(Timer::PeriodicUpdate, kT3412Seconds * 1000ULL);
+  core_.after(Timer::PeriodicUpdate, core_.state.registration.periodicTimerSeconds * 1000ULL);
   if (running_ != Procedure::None) return;
   wanted_ = Procedure::PeriodicUpdate;
   if (core_.isConnected()) {
@@ -211,9 +212,8 @@ void Registration::updateService() {
     status = isServed ? ServiceStatus::Service : ServiceStatus::Limited;
     domain = ServiceDomain::Camped;
     if (isServed)
-      domain = cell->technology == Technology::Gsm                                  ? ServiceDomain::CsPs
-               : cell->technology == Technology::Umts || !core_.sim.hasVoiceOverLte ? ServiceDomain::CsPs
-                                                                                    : ServiceDomain::PsOnly;
+      domain =
+          isPacketCell(cell->technology) && core_.sim.hasVoiceOverLte ? ServiceDomain::PsOnly : ServiceDomain::CsPs;
     if (isServed && core_.network.operatorOf(*cell) != core_.sim.operatorIndex) roaming = RoamStatus::On;
   }
   if (status == state.service && domain == state.domain && roaming == state.roaming &&

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "hosts/simulator/network/Cell.h"
+#include "hosts/simulator/network/ModemEvent.h"
 #include "hosts/simulator/network/ModemState.h"
 
 // A scenario: a small radio network, a way through it, the SIMs, and what its user does.
@@ -122,7 +123,7 @@ struct StallData {
   bool isDnsFailure = false;
 };
 struct MetricTraffic {
-  std::uint8_t kind = 0;  // event::CueKind
+  event::CueKind kind = event::CueKind::Burst;
   std::uint32_t count = 1;
   std::uint32_t bytes = 0;
 };

@@ -2,8 +2,6 @@
 
 #include <string>
 
-#include "hosts/simulator/network/ModemEvent.h"
-
 namespace quorl::simulator::network {
 namespace {
 
@@ -46,7 +44,7 @@ action::SetSim setSim(ScenarioLine& line) {
 
 action::MetricTraffic traffic(ScenarioLine& line, event::CueKind kind) {
   action::MetricTraffic result;
-  result.kind = static_cast<std::uint8_t>(kind);
+  result.kind = kind;
   result.count = static_cast<std::uint32_t>(line.whole("count", 1, 1000000));
   if (kind == event::CueKind::Oversized)
     result.bytes = static_cast<std::uint32_t>(line.wholeSetting("bytes", 1 << 20, 1, 64 << 20));

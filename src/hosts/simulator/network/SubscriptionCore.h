@@ -107,9 +107,7 @@ class SubscriptionCore {
   SimulatedMs now() const { return phone.nowMs; }
   const Cell* cell() const { return state.serving ? state.serving->best.cell : nullptr; }
   /// Whether a connection stands, with signalling and data.
-  bool isConnected() const {
-    return state.rrc == RrcState::Connected || state.rrc == RrcState::CellDch || state.rrc == RrcState::CellFach;
-  }
+  bool isConnected() const { return isConnectedState(state.rrc); }
 
   void after(Timer timer, SimulatedMs milliseconds) { due(timer) = now() + milliseconds; }
   void cancel(Timer timer) { due(timer) = kNever; }
@@ -138,7 +136,7 @@ class SubscriptionCore {
   }
   /// Only LTE and NR messages are told.
   void say(const Cell* on, event::AirMessageKind kind, bool isUplink, std::uint8_t bearer, std::uint16_t length) {
-    if (on == nullptr || (on->technology != Technology::Lte && on->technology != Technology::Nr)) return;
+    if (on == nullptr || !isPacketCell(on->technology)) return;
     emit(event::AirMessage{on, kind, isUplink, bearer, length});
   }
 
