@@ -1,6 +1,7 @@
 #include <cerrno>
 #include <iostream>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <system_error>
@@ -37,8 +38,11 @@ bool writeAll(int file, std::string_view text) {
 int writeFile(const std::string& path, std::string_view text) {
   const int file = open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0600);
   bool isWritten = file >= 0 && writeAll(file, text);
-  const int error = errno;
-  if (file >= 0 && close(file) != 0) isWritten = false;
+  int error = errno;
+  if (file >= 0 && close(file) != 0 && isWritten) {
+    isWritten = false;
+    error = errno;
+  }
   if (isWritten) return kSuccess;
   complain(fmt::format("{}: {}", path, std::generic_category().message(error)));
   return kFailure;

@@ -5,7 +5,6 @@
 #include <initializer_list>
 #include <string>
 #include <string_view>
-#include <type_traits>
 #include <variant>
 
 // What subcommands print as JSON, one object a line. The JSON library stays behind this face, as it takes seconds to

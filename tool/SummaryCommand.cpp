@@ -2,12 +2,15 @@
 #include <iostream>
 #include <memory>
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include <fmt/format.h>
 
 #include "Commands.h"
 #include "Documents.h"
 #include "JsonLine.h"
+#include "TextTable.h"
 
 namespace quorl::tool {
 namespace {
@@ -28,8 +31,8 @@ void printTable(const std::vector<MetricSummary>& metrics) {
     rowsWidth = std::max(rowsWidth, std::to_string(metric.rows).size());
   }
   const auto print = [&](const MetricSummary& metric, const std::string& rows) {
-    std::cout << fmt::format("{:<{}}  {:<{}}  {:>{}}  {}\n", metric.tech, techWidth, metric.name, nameWidth, rows,
-                             rowsWidth, metric.lastSeen);
+    std::cout << fmt::format("{:<{}}  {:<{}}  {:>{}}  {}\n", printable(metric.tech), techWidth, printable(metric.name),
+                             nameWidth, rows, rowsWidth, printable(metric.lastSeen));
   };
   print(head, "Rows");
   for (const MetricSummary& metric : metrics) print(metric, std::to_string(metric.rows));
