@@ -12,10 +12,8 @@ set(quorl_data ${CMAKE_INSTALL_DATADIR}/quorl)
 file(GLOB device_configurations CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/resources/*.deviceconfig)
 install(FILES ${device_configurations} DESTINATION ${quorl_data})
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/resources/recordings ${PROJECT_SOURCE_DIR}/resources/telephony
+                  ${PROJECT_SOURCE_DIR}/resources/scenarios
         DESTINATION ${quorl_data})
-if(IS_DIRECTORY ${PROJECT_SOURCE_DIR}/resources/scenarios)
-  install(DIRECTORY ${PROJECT_SOURCE_DIR}/resources/scenarios DESTINATION ${quorl_data})
-endif()
 install(DIRECTORY ${CMAKE_BINARY_DIR}/share/quorl/locale DESTINATION ${quorl_data})
 
 foreach(program IN LISTS programs)

@@ -4,6 +4,7 @@
 #include <fstream>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "Hexadecimal.h"
 #include "MessageJson.h"
@@ -12,7 +13,8 @@
 #include "messages/MessageTable.h"
 #include "messages/MetricCodable.h"
 
-// Turns recordings into seeds for every fuzz target: fuzz_make_seeds FOLDER RECORDING...
+// Turns recordings into seeds for the targets that take payloads, recordings or the input of the tool: fuzz_make_seeds
+// FOLDER RECORDING...
 
 namespace {
 

@@ -1,6 +1,8 @@
 #include <cstddef>
 #include <cstdint>
+#include <cstdlib>
 #include <memory>
+#include <optional>
 #include <string_view>
 #include <utility>
 

@@ -3,7 +3,7 @@
 . "$(dirname "${BASH_SOURCE[0]}")/setup.sh"
 seconds=${1:?seconds for each target}
 shift
-configure fuzz -DQUORL_UI=OFF
+configure fuzz
 build fuzz
 bin=build/fuzz/bin
 "$bin/fuzz_make_seeds" build/fuzz/seeds resources/recordings/*.jsonl

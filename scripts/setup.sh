@@ -1,4 +1,4 @@
-# Sourced by ./run and ./test: finds the project's root, installs what is missing, and configures a preset.
+# Sourced by ./run, ./test and the scripts that build: finds the project's root, installs what is missing, and configures a preset.
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 cd "$root"
@@ -31,7 +31,7 @@ configure() {
   shift
   local wanted="$preset $*" stamp="build/$preset/.configured"
   if [ ! -f "build/$preset/build.ninja" ] || [ "$(cat "$stamp" 2>/dev/null)" != "$wanted" ]; then
-    cmake --preset "$preset" "$@" >"/dev/null"
+    cmake --preset "$preset" "$@" >/dev/null
     echo "$wanted" >"$stamp"
   fi
 }
