@@ -55,7 +55,7 @@ void Calls::place(const action::PlaceCall& call) {
     pagedOn_ = cell;
     ++state.counters.pages;
     core_.say(Kind::Paging, false, 0, 8);
-    core_.emit(event::Paged{true});
+    core_.emit(event::Paged{});
     // One radio serves both SIMs: a call on one keeps the other from answering.
     if (core_.phone.isInCall[0] || core_.phone.isInCall[1]) {
       failPage(event::PageFailure::Ignored, nullptr);

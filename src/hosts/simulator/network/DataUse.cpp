@@ -53,7 +53,7 @@ void DataUse::ask() {
   if (isTerminated_ && core_.state.rrc == RrcState::Idle) {
     ++core_.state.counters.pages;
     core_.say(event::AirMessageKind::Paging, false, 0, 8);
-    core_.emit(event::Paged{true});
+    core_.emit(event::Paged{});
   }
   connection_.request(isTerminated_ ? RrcCause::MtAccess : RrcCause::MoData);
 }

@@ -182,8 +182,6 @@ struct PlmnChanged {
 };
 struct ServiceChanged {
   ServiceStatus previous = ServiceStatus::None;
-  ServiceDomain previousDomain = ServiceDomain::None;
-  Technology previousTechnology = Technology::None;
   std::uint64_t previousMs = 0;
 };
 struct OperatingModeChanged {
@@ -246,9 +244,8 @@ struct PageResponseFailed {
   const Cell* attemptedCell = nullptr;  // where the fall back went; may be null
   PageFailure cause = PageFailure::ConnectionFailed;
 };
-struct Paged {
-  bool isForThisPhone = true;
-};
+/// A page for this subscription came.
+struct Paged {};
 
 enum class DataConnectionStatus : std::uint8_t { Disconnected, Connecting, Connected, Disconnecting };
 struct DataConnectionChanged {

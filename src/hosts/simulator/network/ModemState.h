@@ -78,10 +78,9 @@ struct RegistrationContext {
   RegistrationState state = RegistrationState::NotRegistered;
   RegistrationProcedure procedure = RegistrationProcedure::None;  // the last
   std::uint8_t rejectCause = 0;                                   // TS 24.301 9.9.3.9, 0 for none
-  std::uint8_t equivalentPlmns = 0;
-  Plmn plmn;                               // the registered one
-  std::uint32_t areaCode = 0;              // of the last successful update
-  std::vector<std::uint32_t> areas;        // LTE and NR: the tracking area list
+  Plmn plmn;                                                      // the registered one
+  std::uint32_t areaCode = 0;                                     // of the last successful update
+  std::vector<std::uint32_t> areas;                               // LTE and NR: the tracking area list
   std::uint32_t temporaryId = 0;           // M-TMSI, P-TMSI; changes at attach and area update. Invented.
   std::uint32_t circuitTemporaryId = 0;    // TMSI
   std::uint16_t groupId = 0;               // MMEGI

@@ -219,7 +219,7 @@ void Registration::updateService() {
   if (status == state.service && domain == state.domain && roaming == state.roaming &&
       toldTechnology_ == state.technology)
     return;
-  const event::ServiceChanged changed{state.service, state.domain, toldTechnology_, core_.now() - state.serviceSinceMs};
+  const event::ServiceChanged changed{state.service, core_.now() - state.serviceSinceMs};
   state.service = status;
   state.domain = domain;
   state.roaming = roaming;
