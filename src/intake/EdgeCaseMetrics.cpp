@@ -20,13 +20,11 @@ void applyHomePlmnRule(MetricDictionary& dictionary) {
   const MetricValue* entry = dictionary.find(kHomePlmnListKey);
   const auto* list = entry != nullptr ? entry->get<MetricDictionaryList>() : nullptr;
   if (list == nullptr || list->empty()) return;
-  const MetricValue* mcc = list->back().find("MCC");
-  const MetricValue* mnc = list->back().find("MNC");
-  const std::optional<std::int64_t> country = mcc != nullptr ? mcc->integer() : std::nullopt;
-  const std::optional<std::int64_t> network = mnc != nullptr ? mnc->integer() : std::nullopt;
-  if (!country || !network) return;
+  const std::optional<std::int64_t> mcc = list->back().integer("MCC");
+  const std::optional<std::int64_t> mnc = list->back().integer("MNC");
+  if (!mcc || !mnc) return;
   dictionary.remove(kHomePlmnListKey);
-  dictionary.set("PLMN", Text(fmt::format("{} {}", *country, *network)));
+  dictionary.set("PLMN", Text(fmt::format("{} {}", *mcc, *mnc)));
 }
 
 void removeOtaMsgCellKeys(MetricDictionary& dictionary) {

@@ -20,34 +20,24 @@ MetricFloat computed(float value) {
   return MetricFloat{value, /*isComputed=*/true};
 }
 
-std::optional<std::int64_t> integerAt(const MetricDictionary& dictionary, std::string_view key) {
-  const MetricValue* value = dictionary.find(key);
-  return value != nullptr ? value->integer() : std::nullopt;
-}
-
-std::optional<float> numberAt(const MetricDictionary& dictionary, std::string_view key) {
-  const MetricValue* value = dictionary.find(key);
-  return value != nullptr ? value->number() : std::nullopt;
-}
-
 /// Adds `offset` to an integer; wraps at the ends of its range.
 void shift(MetricDictionary& element, std::string_view key, std::int64_t offset) {
-  if (const auto value = integerAt(element, key))
+  if (const auto value = element.integer(key))
     element.set(key,
                 static_cast<std::int64_t>(static_cast<std::uint64_t>(*value) + static_cast<std::uint64_t>(offset)));
 }
 
 /// Hundredths to whole units, truncating toward zero.
 void fromHundredths(MetricDictionary& element, std::string_view key) {
-  if (const auto value = integerAt(element, key)) element.set(key, *value / 100);
+  if (const auto value = element.integer(key)) element.set(key, *value / 100);
 }
 
 void convertCarrier(MetricDictionary& element, const MetricDictionary& top) {
   if (const MetricValue* timestamp = top.find(kTimestampKey)) element.set(kTimestampKey, *timestamp);
   fromHundredths(element, "rsrp");
-  if (const auto rsrq = numberAt(element, "rsrq")) element.set("rsrq", computed(*rsrq / 100.0F));
+  if (const auto rsrq = element.number("rsrq")) element.set("rsrq", computed(*rsrq / 100.0F));
   fromHundredths(element, "rssi");
-  if (const auto code = integerAt(element, "dl_bandwidth")) {
+  if (const auto code = element.integer("dl_bandwidth")) {
     if (*code >= 0 && *code < std::ssize(MetricService::dlbwlookup)) {
       element.set("dl_bandwidth", computed(MetricService::dlbwlookup[static_cast<std::size_t>(*code)]));
     } else {
@@ -70,7 +60,7 @@ void convertRxInfo(MetricDictionary& element, const MetricDictionary& top) {
 
 void convertUtraNeighbor(MetricDictionary& element, const MetricDictionary& /*top*/) {
   shift(element, "rscp", -116);
-  if (const auto ecno = numberAt(element, "ecno")) element.set("ecno", computed(*ecno * 0.5F + -24.5F));
+  if (const auto ecno = element.number("ecno")) element.set("ecno", computed(*ecno * 0.5F + -24.5F));
 }
 
 /// One dictionary of the entries of all; for a key that repeats the later value wins.
@@ -135,8 +125,7 @@ MetricDictionary MetricService::parseIceMetric(std::string_view hexId, const Met
         if (!element.empty()) rule->convert(element, dictionary);
     result = rule->merge(std::move(elements));
   }
-  const MetricValue* subsId = dictionary.find(kSubsIdKey);
-  if (subsId != nullptr && subsId->integer32()) result.set(kSubsIdKey, *subsId);
+  if (dictionary.integer32(kSubsIdKey)) result.set(kSubsIdKey, *dictionary.find(kSubsIdKey));
   return result;
 }
 

@@ -78,16 +78,14 @@ void MetricService::flattenDictionaryIfNeeded(MetricDictionary source, MetricDic
 }
 
 Date MetricService::collectionDate(const MetricDictionary& dictionary) {
-  const MetricValue* timestamp = dictionary.find(kTimestampKey);
-  const std::optional<std::int64_t> milliseconds = timestamp != nullptr ? timestamp->integer() : std::nullopt;
+  const std::optional<std::int64_t> milliseconds = dictionary.integer(kTimestampKey);
   if (!milliseconds) return Platform::current().clock.now();
   constexpr std::int64_t kLimit = std::numeric_limits<std::int64_t>::max() / 1000;
   return Date(std::chrono::milliseconds(std::clamp(*milliseconds, -kLimit, kLimit)));
 }
 
 void MetricService::insertMetricToDatabase(const MetricDictionary& dictionary, const MetricGroupV2& group, Date date) {
-  const MetricValue* subscription = dictionary.find(kSubsIdKey);
-  const std::optional<std::int32_t> subsId = subscription != nullptr ? subscription->integer32() : std::nullopt;
+  const std::optional<std::int32_t> subsId = dictionary.integer32(kSubsIdKey);
   if (!subsId) return;
   metricServiceLog.log("subsId  ---> %{public}d", *subsId);
 

@@ -21,9 +21,9 @@ namespace quorl {
 /// other. Main thread only, except for the constants.
 class MetricService final : public ZelkorWrapperDelegate {
  public:
-  static constexpr std::string_view metricIDKey = "kKeyMetricID";
-  static constexpr std::string_view payloadKey = "kKeyPayload";
-  static constexpr std::string_view profileIDKey = "kKeyProfileID";
+  static constexpr std::string_view metricIDKey = zelkor::kKeyMetricID;
+  static constexpr std::string_view payloadKey = zelkor::kKeyPayload;
+  static constexpr std::string_view profileIDKey = zelkor::kKeyProfileID;
   /// Metrics whose class and rule are fixed by `handleEdgeCaseMetrics`.
   static constexpr std::array<std::int64_t, 4> exceptionMetricIds{806743, 827746, 827650, 806913};
   /// Metrics that `parseIceMetric` rewrites on an Ice device.

@@ -5,6 +5,7 @@
 #include <charconv>
 #include <cmath>
 #include <limits>
+#include <utility>
 
 #include <fmt/format.h>
 
@@ -37,6 +38,21 @@ const MetricValue* MetricDictionary::find(std::string_view key) const {
 
 MetricValue* MetricDictionary::find(std::string_view key) {
   return const_cast<MetricValue*>(std::as_const(*this).find(key));
+}
+
+std::optional<std::int64_t> MetricDictionary::integer(std::string_view key) const {
+  const MetricValue* value = find(key);
+  return value != nullptr ? value->integer() : std::nullopt;
+}
+
+std::optional<std::int32_t> MetricDictionary::integer32(std::string_view key) const {
+  const MetricValue* value = find(key);
+  return value != nullptr ? value->integer32() : std::nullopt;
+}
+
+std::optional<float> MetricDictionary::number(std::string_view key) const {
+  const MetricValue* value = find(key);
+  return value != nullptr ? value->number() : std::nullopt;
 }
 
 MetricValue& MetricDictionary::slot(std::string_view key, const Text* shared) {

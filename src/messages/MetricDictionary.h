@@ -59,8 +59,13 @@ class MetricDictionary {
   /// Removes `key` if it is there.
   void remove(std::string_view key);
 
+  /// Null when the key is missing. Valid until the dictionary changes.
   const struct MetricValue* find(std::string_view key) const;
   struct MetricValue* find(std::string_view key);
+  // The value of `key` as `MetricValue` answers it under the same name; nothing when the key is missing.
+  std::optional<std::int64_t> integer(std::string_view key) const;
+  std::optional<std::int32_t> integer32(std::string_view key) const;
+  std::optional<float> number(std::string_view key) const;
 
   /// In the order in which they were set.
   const std::vector<MetricEntry>& entries() const { return entries_; }
