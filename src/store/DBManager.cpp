@@ -33,10 +33,6 @@ std::string messageOf(sqlite3* database) {
 
 }  // namespace
 
-void FinalizeStatement::operator()(sqlite3_stmt* statement) const {
-  sqlite3_finalize(statement);
-}
-
 std::optional<std::string> databasePath() {
   const std::optional<std::filesystem::path> directory = Platform::current().documents.path();
   if (!directory) return std::nullopt;

@@ -11,6 +11,7 @@
 #include "base/Queue.h"
 #include "store/Metric.h"
 #include "store/SQLiteError.h"
+#include "store/StatementHandle.h"
 #include "store/StoreCompletions.h"
 
 struct sqlite3;
@@ -22,12 +23,6 @@ namespace store_detail {
 class KeptReadings;
 class MainHandOver;
 }  // namespace store_detail
-
-struct FinalizeStatement {
-  void operator()(sqlite3_stmt* statement) const;
-};
-/// A prepared statement, finalised when it goes away.
-using StatementHandle = std::unique_ptr<sqlite3_stmt, FinalizeStatement>;
 
 /// Full path of the database file, directly in the documents directory; nothing when that cannot be had.
 std::optional<std::string> databasePath();

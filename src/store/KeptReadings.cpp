@@ -1,26 +1,23 @@
 #include "store/KeptReadings.h"
 
 #include <algorithm>
+#include <iterator>
 #include <limits>
-#include <memory>
 
 #include <sqlite3.h>
 
 #include "store/ConnectionLock.h"
 #include "store/MetricStatements.h"
+#include "store/StatementHandle.h"
 
 namespace quorl::store_detail {
 namespace {
 
-struct Finalize {
-  void operator()(sqlite3_stmt* statement) const { sqlite3_finalize(statement); }
-};
-using Statement = std::unique_ptr<sqlite3_stmt, Finalize>;
-
-Statement prepare(sqlite3* connection, const char* sql) {
+/// Null if `sql` does not prepare.
+StatementHandle prepare(sqlite3* connection, const char* sql) {
   sqlite3_stmt* statement = nullptr;
   sqlite3_prepare_v2(connection, sql, -1, &statement, nullptr);
-  return Statement(statement);
+  return StatementHandle(statement);
 }
 
 // Begins a transaction, which is when the connection takes notice of other ones, and reads next to nothing.
@@ -163,14 +160,14 @@ void KeptReadings::dashboardHasChanged() {
 
 bool KeptReadings::looksAtFile() const {
   if (sqlite3_get_autocommit(connection_) == 0) return false;
-  const Statement statement = prepare(connection_, kLook);
+  const StatementHandle statement = prepare(connection_, kLook);
   if (!statement) return false;
   const int result = sqlite3_step(statement.get());
   return result == SQLITE_ROW || result == SQLITE_DONE;
 }
 
 bool KeptReadings::isOwnTable() const {
-  const Statement statement = prepare(connection_, kSchemaOfMetric);
+  const StatementHandle statement = prepare(connection_, kSchemaOfMetric);
   if (!statement || sqlite3_step(statement.get()) != SQLITE_ROW) return false;
   PlainRow row(statement.get());
   const std::string_view sql = row.text(0);
@@ -180,7 +177,7 @@ bool KeptReadings::isOwnTable() const {
 
 KeptReadings::Stage KeptReadings::load() {
   if (!isOwnTable()) return Stage::refused;
-  const Statement statement = prepare(connection_, kAllReadings);
+  const StatementHandle statement = prepare(connection_, kAllReadings);
   if (!statement) return Stage::unread;
   const ConnectionLock lock(connection_);  // once for all rows
   int result = sqlite3_step(statement.get());

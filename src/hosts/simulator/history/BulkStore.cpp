@@ -25,10 +25,6 @@ void BulkStore::CloseDatabase::operator()(sqlite3* database) const {
   sqlite3_close(database);
 }
 
-void BulkStore::FinalizeStatement::operator()(sqlite3_stmt* statement) const {
-  sqlite3_finalize(statement);
-}
-
 BulkStore::~BulkStore() = default;
 
 tl::expected<std::unique_ptr<BulkStore>, std::string> BulkStore::open(const std::filesystem::path& file) {

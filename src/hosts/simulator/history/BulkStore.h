@@ -8,9 +8,9 @@
 #include <tl/expected.hpp>
 
 #include "store/PersistanceStoreProtocol.h"
+#include "store/StatementHandle.h"
 
 struct sqlite3;
-struct sqlite3_stmt;
 
 namespace quorl::simulator {
 
@@ -55,9 +55,6 @@ class BulkStore final : public PersistanceStoreProtocol {
   struct CloseDatabase {
     void operator()(sqlite3* database) const;
   };
-  struct FinalizeStatement {
-    void operator()(sqlite3_stmt* statement) const;
-  };
 
   explicit BulkStore(sqlite3* database) : database_(database) {}
   Outcome prepare();
@@ -66,7 +63,7 @@ class BulkStore final : public PersistanceStoreProtocol {
   void fail();
 
   std::unique_ptr<sqlite3, CloseDatabase> database_;
-  std::unique_ptr<sqlite3_stmt, FinalizeStatement> insert_;
+  StatementHandle insert_;
   std::uint64_t rows_ = 0;
   std::uint64_t rowsInTransaction_ = 0;
   Date lastDate_;  // rows of one metric share their time
