@@ -13,10 +13,8 @@
 namespace quorl::generator {
 namespace {
 
-using testing::Test;
-
 /// Schema files given as descriptors in text form.
-class GeneratorTest : public Test {
+class GeneratorTest : public testing::Test {
  protected:
   const google::protobuf::FileDescriptor& file(const std::string& content) {
     google::protobuf::FileDescriptorProto proto;
@@ -124,6 +122,12 @@ TEST_F(GeneratorTest, RepeatedTextsAreRefused) {
 TEST_F(GeneratorTest, NamesOfTheBaseClassAreRefused) {
   EXPECT_EQ(refusal(fileWithField("name: 'read_from' label: LABEL_OPTIONAL type: TYPE_UINT32")),
             "Sample.read_from: the member name is taken; give it another with the option `member`");
+}
+
+TEST_F(GeneratorTest, KeywordsAreRefused) {
+  for (const std::string key : {"class", "struct", "while", "true"})
+    EXPECT_EQ(refusal(fileWithField("name: '" + key + "' label: LABEL_OPTIONAL type: TYPE_UINT32")),
+              "Sample." + key + ": the member name is taken; give it another with the option `member`");
 }
 
 TEST_F(GeneratorTest, MessageThatContainsItselfIsRefused) {

@@ -1,7 +1,7 @@
 #include "messages/generator/Fields.h"
 
 #include <algorithm>
-#include <array>
+#include <iterator>
 #include <set>
 #include <stdexcept>
 #include <string_view>
@@ -14,16 +14,22 @@ using google::protobuf::FieldDescriptor;
 namespace {
 
 // The base class's own names, and the C++ keywords that a camel-cased key could be.
-constexpr std::array<std::string_view, 53> kTakenNames = {
-    "table",    "initWithData", "isReadWhole", "readFrom", "writeTo",      "dictionaryRepresentation",
-    "hash",     "description",  "copyTo",      "isEqual",  "copyWithZone", "mergeFrom",
-    "auto",     "bool",         "break",       "case",     "catch",        "char",
-    "class",    "const",        "continue",    "default",  "delete",       "do",
-    "double",   "else",         "enum",        "explicit", "export",       "extern",
-    "float",    "for",          "friend",      "goto",     "if",           "inline",
-    "int",      "long",         "new",         "operator", "private",      "public",
-    "register", "return",       "short",       "signed",   "static",       "switch",
-    "this",     "union",        "unsigned",    "void",     "volatile"};
+constexpr std::string_view kTakenNames[] = {
+    "table",     "initWithData", "isReadWhole", "readFrom", "writeTo",      "dictionaryRepresentation",
+    "hash",      "description",  "copyTo",      "isEqual",  "copyWithZone", "mergeFrom",
+    "alignas",   "alignof",      "and",         "asm",      "auto",         "bitand",
+    "bitor",     "bool",         "break",       "case",     "catch",        "char",
+    "class",     "compl",        "concept",     "const",    "consteval",    "constexpr",
+    "constinit", "continue",     "decltype",    "default",  "delete",       "do",
+    "double",    "else",         "enum",        "explicit", "export",       "extern",
+    "false",     "float",        "for",         "friend",   "goto",         "if",
+    "inline",    "int",          "long",        "mutable",  "namespace",    "new",
+    "noexcept",  "not",          "nullptr",     "operator", "or",           "private",
+    "protected", "public",       "register",    "requires", "return",       "short",
+    "signed",    "sizeof",       "static",      "struct",   "switch",       "template",
+    "this",      "throw",        "true",        "try",      "typedef",      "typeid",
+    "typename",  "union",        "unsigned",    "using",    "virtual",      "void",
+    "volatile",  "while",        "xor"};
 
 [[noreturn]] void fail(const FieldDescriptor& field, const std::string& why) {
   throw std::runtime_error(field.full_name() + ": " + why);
@@ -65,7 +71,7 @@ Field makeField(const FieldDescriptor& descriptor) {
   field.member = memberName(descriptor) + "_";
   field.alignment = 8;
   field.flagIndex = -1;
-  if (std::find(kTakenNames.begin(), kTakenNames.end(), memberName(descriptor)) != kTakenNames.end())
+  if (std::find(std::begin(kTakenNames), std::end(kTakenNames), memberName(descriptor)) != std::end(kTakenNames))
     fail(descriptor, "the member name is taken; give it another with the option `member`");
   switch (descriptor.type()) {
     case FieldDescriptor::TYPE_MESSAGE:

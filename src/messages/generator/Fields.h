@@ -25,7 +25,7 @@ struct Field {
   bool isRepeated() const { return descriptor->is_repeated(); }
   bool isScalar() const { return flagIndex >= 0; }
   bool isEnumeration() const { return descriptor->enum_type() != nullptr; }
-  /// Whether the getter tests the flag, and what it then answers for an absent field.
+  /// Whether the getter tests the flag and answers `defaultValue` for an absent field.
   bool hasDefault() const { return isEnumeration() || descriptor->has_default_value(); }
   int defaultValue() const;
 };
