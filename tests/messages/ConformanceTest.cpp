@@ -37,9 +37,7 @@ class ConformanceTest : public testing::TestWithParam<const MessageTable*> {
   }
 
   std::unique_ptr<MetricCodable> decode(const std::string& payload) const {
-    auto message = makeMessage(table().className);
-    message->initWithData(ByteString(payload));
-    return message;
+    return test::decoded(table().className, payload);
   }
 
   void expectContent(const MetricCodable& message, const Message& expected, const Message& named) const {
@@ -47,12 +45,6 @@ class ConformanceTest : public testing::TestWithParam<const MessageTable*> {
     ASSERT_TRUE(dictionary.has_value());
     const MetricDictionary wanted = test::expectedDictionary(expected, *named.GetDescriptor());
     ASSERT_EQ(*dictionary, wanted) << logText(*dictionary) << "\n" << logText(wanted);
-  }
-
-  static std::string encode(const MetricCodable& message) {
-    WireWriter writer;
-    message.writeTo(writer);
-    return writer.take();
   }
 
   std::mt19937_64& random() { return random_; }
@@ -76,7 +68,7 @@ TEST_P(ConformanceTest, WhatIsWrittenHereHasTheSameContentThere) {
     fill(*message, round);
     const auto decoded = decode(message->SerializeAsString());
     const auto read = protobufMessage();
-    ASSERT_TRUE(read->ParseFromString(encode(*decoded)));
+    ASSERT_TRUE(read->ParseFromString(test::encoded(*decoded)));
     ASSERT_TRUE(MessageDifferencer::Equals(*message, *read)) << message->ShortDebugString();
   }
 }
@@ -89,7 +81,7 @@ TEST_P(ConformanceTest, ListsInTheOtherFormAndEnumerationsWithAnyNumberReadTheSa
     const auto decoded = decode(message->SerializeAsString());
     ASSERT_NO_FATAL_FAILURE(expectContent(*decoded, *message, *named));
     const auto read = test::OtherSender::shared().newMessage(table().className);
-    ASSERT_TRUE(read->ParseFromString(encode(*decoded)));
+    ASSERT_TRUE(read->ParseFromString(test::encoded(*decoded)));
     ASSERT_TRUE(MessageDifferencer::Equals(*message, *read)) << message->ShortDebugString();
   }
 }

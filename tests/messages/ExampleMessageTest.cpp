@@ -13,7 +13,7 @@ using test::written;
 
 constexpr char kPayload[] = "08 E8 07 10 02 32 05 08 AC 02 10 05 38 07 50 01 78 01";
 
-TEST(WorkedMemberTest, EmmContextReadsFromItsBytes) {
+TEST(ExampleMessageTest, EmmContextReadsFromItsBytes) {
   KCellularEmmContext context;
   ASSERT_TRUE(read(context, kPayload));
 
@@ -39,7 +39,7 @@ TEST(WorkedMemberTest, EmmContextReadsFromItsBytes) {
   EXPECT_EQ(context.updateStatus(), 0);
 }
 
-TEST(WorkedMemberTest, EmmContextHasAnEntryForEachPresentField) {
+TEST(ExampleMessageTest, EmmContextHasAnEntryForEachPresentField) {
   KCellularEmmContext context;
   ASSERT_TRUE(read(context, kPayload));
   EXPECT_EQ(dictionaryText(context),
@@ -47,7 +47,7 @@ TEST(WorkedMemberTest, EmmContextHasAnEntryForEachPresentField) {
             "reject_cause: EMM_CAUSE_EPS_SERVICES_NOT_ALLOWED, is_ims_voice_supported: true, subs_id: 1]");
 }
 
-TEST(WorkedMemberTest, EmmContextBuiltWithSettersWritesItsBytes) {
+TEST(ExampleMessageTest, EmmContextBuiltWithSettersWritesItsBytes) {
   KCellularEmmContext context;
   // Not the order of the table: that of the writing does not depend on it.
   context.setSubsId(1);
@@ -62,7 +62,7 @@ TEST(WorkedMemberTest, EmmContextBuiltWithSettersWritesItsBytes) {
   EXPECT_EQ(written(context), kPayload);
 }
 
-TEST(WorkedMemberTest, PackedTransmitPowersReadInBothForms) {
+TEST(ExampleMessageTest, PackedTransmitPowersReadInBothForms) {
   KCellularGsmCsRfMeasurement packed;
   KCellularGsmCsRfMeasurement unpacked;
   ASSERT_TRUE(read(packed, "2A 02 05 04"));
@@ -72,7 +72,7 @@ TEST(WorkedMemberTest, PackedTransmitPowersReadInBothForms) {
   EXPECT_TRUE(packed.isEqual(unpacked));
 }
 
-TEST(WorkedMemberTest, TransmitPowersAreWrittenPacked) {
+TEST(ExampleMessageTest, TransmitPowersAreWrittenPacked) {
   KCellularGsmCsRfMeasurement measurement;
   measurement.addCsTxPwr(-3);
   measurement.addCsTxPwr(2);

@@ -16,6 +16,8 @@
 namespace quorl {
 namespace {
 
+using test::encoded;
+
 constexpr int kMessages = 50;
 
 class MessagePropertyTest : public testing::TestWithParam<const MessageTable*> {
@@ -29,9 +31,7 @@ class MessagePropertyTest : public testing::TestWithParam<const MessageTable*> {
   }
 
   std::unique_ptr<MetricCodable> decode(const std::string& payload) const {
-    auto message = empty();
-    message->initWithData(ByteString(payload));
-    return message;
+    return test::decoded(GetParam()->className, payload);
   }
 
   std::vector<std::unique_ptr<MetricCodable>> randomMessages() {
@@ -39,12 +39,6 @@ class MessagePropertyTest : public testing::TestWithParam<const MessageTable*> {
     messages.push_back(empty());
     while (messages.size() < kMessages) messages.push_back(decode(randomPayload()));
     return messages;
-  }
-
-  static std::string encode(const MetricCodable& message) {
-    WireWriter writer;
-    message.writeTo(writer);
-    return writer.take();
   }
 
   std::mt19937_64 random_{1000};
@@ -102,7 +96,7 @@ TEST_P(MessagePropertyTest, MergingIntoAnEmptyMessageGivesAnEqualOne) {
 TEST_P(MessagePropertyTest, EqualityIsThatOfTheWrittenBytes) {
   const auto messages = randomMessages();
   for (std::size_t i = 1; i < messages.size(); ++i) {
-    const bool isSame = encode(*messages[i - 1]) == encode(*messages[i]);
+    const bool isSame = encoded(*messages[i - 1]) == encoded(*messages[i]);
     ASSERT_EQ(messages[i - 1]->isEqual(*messages[i]), isSame);
     ASSERT_EQ(messages[i]->isEqual(*messages[i - 1]), isSame);
     if (isSame) {
@@ -113,11 +107,11 @@ TEST_P(MessagePropertyTest, EqualityIsThatOfTheWrittenBytes) {
 
 TEST_P(MessagePropertyTest, WritingReadingAndWritingGivesTheSameBytes) {
   for (const auto& message : randomMessages()) {
-    const std::string first = encode(*message);
+    const std::string first = encoded(*message);
     const auto again = decode(first);
     ASSERT_TRUE(again->isReadWhole());
     ASSERT_TRUE(again->isEqual(*message));
-    ASSERT_EQ(encode(*again), first);
+    ASSERT_EQ(encoded(*again), first);
   }
 }
 
@@ -145,7 +139,7 @@ TEST_P(MessagePropertyTest, EveryDamagedPayloadIsRefusedOrReadsToSomethingThatCa
       payload[random_() % payload.size()] = static_cast<char>(random_());
     const auto message = decode(payload);
     ASSERT_EQ(message->dictionaryRepresentation().has_value(), message->isReadWhole());
-    const auto again = decode(encode(*message));
+    const auto again = decode(encoded(*message));
     ASSERT_TRUE(again->isReadWhole());
     ASSERT_TRUE(again->isEqual(*message));
   }

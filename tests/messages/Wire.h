@@ -1,7 +1,6 @@
 #pragma once
 
-#include <initializer_list>
-#include <optional>
+#include <memory>
 #include <string>
 #include <string_view>
 
@@ -48,11 +47,23 @@ inline bool read(MetricCodable& message, std::string_view payload) {
   return message.readFrom(reader);
 }
 
-/// What `message` writes, in hexadecimal.
-inline std::string written(const MetricCodable& message) {
+/// A message of the class of this name, which must exist, made from a payload.
+inline std::unique_ptr<MetricCodable> decoded(std::string_view className, std::string_view payload) {
+  auto message = makeMessage(className);
+  message->initWithData(ByteString(payload));
+  return message;
+}
+
+/// What `message` writes.
+inline std::string encoded(const MetricCodable& message) {
   WireWriter writer;
   message.writeTo(writer);
-  return hex(writer.bytes());
+  return writer.take();
+}
+
+/// The same in hexadecimal.
+inline std::string written(const MetricCodable& message) {
+  return hex(encoded(message));
 }
 
 /// The dictionary of a message that was read whole, as its log text; "none" for another.

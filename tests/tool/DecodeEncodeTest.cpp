@@ -27,7 +27,7 @@ std::string encodeFault(const std::string& json) {
   return result.errors;
 }
 
-TEST(ToolDecode, PrintsTheWorkedMember) {
+TEST(ToolDecode, PrintsTheExampleMessage) {
   const ToolResult result = decode("KCellularEmmContext", std::string(kWorkedPayload) + "\n");
   EXPECT_EQ(result.exitCode, 0);
   EXPECT_EQ(result.output, std::string(kWorkedJson) + "\n");
@@ -82,7 +82,7 @@ TEST(ToolDecode, NoInputGivesNoOutput) {
   EXPECT_EQ(result.exitCode, 0);
 }
 
-TEST(ToolEncode, WritesTheWorkedMember) {
+TEST(ToolEncode, WritesTheExampleMessage) {
   const ToolResult result = encode("KCellularEmmContext", std::string(kWorkedJson) + "\n");
   EXPECT_EQ(result.output, std::string(kWorkedPayload) + "\n");
   EXPECT_EQ(result.exitCode, 0);
