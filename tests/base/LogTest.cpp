@@ -56,13 +56,13 @@ TEST(LogTest, AnArgumentThatLooksLikeAPlaceholderIsNotReadAsOne) {
   EXPECT_EQ(log.texts(), (std::vector<std::string>{"%{public}s then last"}));
 }
 
-TEST(LogTest, PlaceholdersAreCountedAsTheCompilerDoes) {
-  static_assert(log_detail::countPlaceholders("none") == 0);
-  static_assert(log_detail::countPlaceholders("%{public}s and %{public}@ and %{public}ld") == 3);
-  static_assert(log_detail::countPlaceholders("100 %") == 0);
-  static_assert(log_detail::countPlaceholders("%%d") == 0);
-  static_assert(log_detail::countPlaceholders("%{public") == 0);
-  static_assert(log_detail::countPlaceholders("Unknown tag: %x:%u") == 2);
+TEST(LogTest, OnlyPlaceholdersAreCounted) {
+  EXPECT_EQ(log_detail::countPlaceholders("none"), 0U);
+  EXPECT_EQ(log_detail::countPlaceholders("%{public}s and %{public}@ and %{public}ld"), 3U);
+  EXPECT_EQ(log_detail::countPlaceholders("100 %"), 0U);
+  EXPECT_EQ(log_detail::countPlaceholders("%%d"), 0U);
+  EXPECT_EQ(log_detail::countPlaceholders("%{public"), 0U);
+  EXPECT_EQ(log_detail::countPlaceholders("Unknown tag: %x:%u"), 2U);
 }
 
 TEST(LogTest, NothingIsRenderedWhenNobodyListens) {

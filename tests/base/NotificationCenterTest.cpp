@@ -1,3 +1,4 @@
+#include <atomic>
 #include <string>
 #include <thread>
 #include <vector>

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <chrono>
 #include <functional>
 #include <memory>
 #include <string>
@@ -9,6 +10,11 @@
 #include "platform/SondrelLibrary.h"
 
 namespace quorl::test {
+
+/// A collected file of 32 KB, of 2026-01-05 09:30:12 UTC.
+inline SondrelFileInformation logFile(std::string name) {
+  return {std::move(name), "32 KB", Date(std::chrono::seconds(1767605412))};
+}
 
 /// A capture library that records its calls and calls back when a test says so.
 class FakeSondrelFactory final : public SondrelFactory {

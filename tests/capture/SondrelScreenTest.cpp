@@ -1,4 +1,5 @@
 #include <chrono>
+#include <cmath>
 #include <memory>
 #include <string>
 #include <utility>
@@ -17,10 +18,8 @@ namespace quorl::test {
 namespace {
 
 using namespace std::chrono_literals;
-using ::testing::Contains;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
-using ::testing::Not;
 using ::testing::SizeIs;
 using Action = SondrelViewController::Action;
 
@@ -28,13 +27,9 @@ LogLine uiLine(std::string text) {
   return {"app-ui", LogLevel::Default, std::move(text)};
 }
 
-SondrelFileInformation file(std::string name) {
-  return {std::move(name), "32 KB", Date(1767605412s)};
-}
-
 std::vector<SondrelFileInformation> files(std::size_t count, const std::string& prefix = "log") {
   std::vector<SondrelFileInformation> batch;
-  for (std::size_t index = 0; index < count; ++index) batch.push_back(file(prefix + std::to_string(index)));
+  for (std::size_t index = 0; index < count; ++index) batch.push_back(logFile(prefix + std::to_string(index)));
   return batch;
 }
 
@@ -448,7 +443,7 @@ TEST_F(SondrelScreenTest, ARowShowsNameSizeAndTimeWithoutASpinner) {
   const ScopedTimeZone zone("America/New_York");
   const ScopedLocale locale("en_US");
   opens();
-  receives({file("000001-Default.chunk")});
+  receives({logFile("000001-Default.chunk")});
   EXPECT_EQ(screen->rowAt(0), (FavoritesTableCellV2{"File name: 000001-Default.chunk", "File Size: 32 KB",
                                                     "Jan 5, 2026, 4:30:12\u202fAM", true}));
 }
@@ -457,7 +452,7 @@ TEST_F(SondrelScreenTest, TheTimeOfARowFollowsZoneAndLocale) {
   const ScopedTimeZone zone("Asia/Tokyo");
   const ScopedLocale locale("de_DE");
   opens();
-  receives({file("a")});
+  receives({logFile("a")});
   EXPECT_EQ(screen->rowAt(0).valueLabel, "05.01.2026, 18:30:12");
 }
 

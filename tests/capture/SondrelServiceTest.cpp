@@ -51,10 +51,6 @@ LogLine line(std::string text, LogLevel level = LogLevel::Default) {
   return {"sondrel", level, std::move(text)};
 }
 
-SondrelFileInformation chunk(std::string name) {
-  return {std::move(name), "32 KB", Date(std::chrono::seconds(1767605412))};
-}
-
 class SondrelServiceTest : public ::testing::Test {
  protected:
   void launch() {
@@ -195,14 +191,14 @@ TEST_F(SondrelServiceTest, AnyOtherStateIsUnexpected) {
 
 TEST_F(SondrelServiceTest, FilesGoToTheScreen) {
   launch();
-  service->didCollectLogs({{chunk("a"), chunk("b")}}, std::nullopt);
+  service->didCollectLogs({{logFile("a"), logFile("b")}}, std::nullopt);
   ASSERT_THAT(screen->batches, SizeIs(1));
-  EXPECT_THAT(screen->batches[0], ElementsAre(chunk("a"), chunk("b")));
+  EXPECT_THAT(screen->batches[0], ElementsAre(logFile("a"), logFile("b")));
 }
 
 TEST_F(SondrelServiceTest, ABatchThatComesWithAnErrorIsDeliveredAndTheErrorDropped) {
   launch();
-  service->didCollectLogs({{chunk("a")}}, error);
+  service->didCollectLogs({{logFile("a")}}, error);
   EXPECT_THAT(screen->batches, SizeIs(1));
   EXPECT_THAT(screen->alerts, IsEmpty());
   EXPECT_THAT(log.lines(), IsEmpty());
@@ -216,10 +212,10 @@ TEST_F(SondrelServiceTest, AnEmptyBatchIsDelivered) {
 
 TEST_F(SondrelServiceTest, ABatchWithOneForeignElementCountsAsNone) {
   launch();
-  service->didCollectLogs({{chunk("a"), SondrelUnknownObject()}}, std::nullopt);
-  service->didCollectLogs({{std::string("a"), chunk("b")}}, std::nullopt);
+  service->didCollectLogs({{logFile("a"), SondrelUnknownObject()}}, std::nullopt);
+  service->didCollectLogs({{std::string("a"), logFile("b")}}, std::nullopt);
   EXPECT_THAT(screen->events, IsEmpty());
-  service->didCollectLogs({{chunk("a"), SondrelUnknownObject()}}, error);
+  service->didCollectLogs({{logFile("a"), SondrelUnknownObject()}}, error);
   EXPECT_THAT(screen->events, IsEmpty());
   EXPECT_THAT(screen->alerts, SizeIs(1));
 }
@@ -266,7 +262,7 @@ TEST_F(SondrelServiceTest, AnEmptyListOfConfigurationsIsOfferedToo) {
 TEST_F(SondrelServiceTest, AListThatIsNoListOfTextsIsNothing) {
   launch();
   service->configurationListAvailable(std::nullopt);
-  service->configurationListAvailable({{std::string("Default"), chunk("a")}});
+  service->configurationListAvailable({{std::string("Default"), logFile("a")}});
   EXPECT_THAT(screen->events, IsEmpty());
   EXPECT_THAT(log.lines(), IsEmpty());
 }

@@ -31,7 +31,7 @@ std::vector<LogLine> exceptionLine(std::int64_t metricId) {
            "MetricService - processMetric - exception - metricID " + std::to_string(metricId)}};
 }
 
-/// Lines of the service after the one of the channel and the one of step 3.
+/// All lines of a metric but the first two: that of the channel, and that with which the service takes it up.
 std::vector<LogLine> linesOfTheWalk(const LogRecorder& log) {
   std::vector<LogLine> lines = log.lines();
   EXPECT_GE(lines.size(), 2U);

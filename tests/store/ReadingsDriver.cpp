@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <iterator>
 #include <map>
+#include <utility>
 
 #include "base/DateText.h"
 #include "store/EnumeratorPrefix.h"

@@ -2,12 +2,10 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <functional>
 #include <memory>
 #include <optional>
 #include <random>
 #include <string>
-#include <string_view>
 #include <vector>
 
 #include "store/DBManager.h"
@@ -63,7 +61,8 @@ class ReadingsDriver {
   std::string removal();
   void own(const std::string& sql);
   void compare(const std::string& sql, const std::string& answer, const std::string& expected);
-  /// The rows of `sql` on the product's connection, rendered by `line`, or what became of it.
+  /// What a read must answer by the rows of `sql` on the product's connection, in the form of `compare`; `timeColumn`
+  /// is that of the date, `isList` tells the list of metrics from the contents of one.
   std::string expected(const std::string& sql, std::size_t timeColumn, bool isList);
 
   std::mt19937 random_;

@@ -22,8 +22,6 @@
 
 namespace quorl::test {
 
-using Pairs = std::vector<std::pair<std::string, std::string>>;
-
 /// A phone on virtual time with the service in it.
 class HorvaneServiceTest : public ::testing::Test {
  protected:

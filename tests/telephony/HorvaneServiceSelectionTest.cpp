@@ -3,7 +3,6 @@
 namespace quorl::test {
 namespace {
 
-using namespace std::chrono_literals;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
