@@ -13,6 +13,7 @@
 #include "store/PersistanceStore.h"
 
 namespace quorl {
+
 bool AppDelegate::onLaunch() {
   window_ = std::make_unique<Window>();
   HardwareManager& hardware = HardwareManager::shared();

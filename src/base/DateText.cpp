@@ -1,7 +1,6 @@
 #include "base/DateText.h"
 
 #include <atomic>
-#include <cstdio>
 #include <ctime>
 #include <limits>
 #include <memory>

@@ -1,3 +1,4 @@
+#include <functional>
 #include <stdexcept>
 #include <type_traits>
 

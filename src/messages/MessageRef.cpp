@@ -1,6 +1,7 @@
 #include "messages/MessageRef.h"
 
 #include <stdexcept>
+#include <string>
 
 namespace quorl {
 

@@ -34,7 +34,8 @@ CarrierInfoObject makeRecord(const HVServiceSubscriptionContext& context) {
   return record;
 }
 
-std::string text(const std::optional<SQLiteError>& error) {
+/// Unlike `logText` of an optional error, without "Optional(...)" around it.
+std::string bareText(const std::optional<SQLiteError>& error) {
   return error ? logText(*error) : "nil";
 }
 
@@ -275,7 +276,7 @@ void HorvaneService::insertTelephonyRow(const Metric& row) {
     if (success) {
       NotificationCenter::defaultCenter().post(notification::kNewHVMetric, {{notification::kMetricObjectKey, copy}});
     } else {
-      horvaneServiceLog.error("error occurred while inserting  ---> %{public}s", text(error));
+      horvaneServiceLog.error("error occurred while inserting  ---> %{public}s", bareText(error));
     }
   });
 }
@@ -296,7 +297,7 @@ void HorvaneService::refreshCarrierRows(std::size_t index, const char* metricNam
       [weak = weak_from_this(), index, rows](std::vector<Metric> metrics, const std::optional<SQLiteError>& error) {
         // A failed read may complete on the database's queue, where the service is neither locked nor touched.
         if (metrics.empty()) {
-          if (!weak.expired()) horvaneServiceLog.error("error occured  ---> %{public}s", text(error));
+          if (!weak.expired()) horvaneServiceLog.error("error occured  ---> %{public}s", bareText(error));
           return;
         }
         const auto self = weak.lock();

@@ -20,7 +20,7 @@
 
 namespace quorl {
 
-/// The face under which the store keeps the service.
+/// An abstract face of the service. It offers nothing, and nobody asks for it: the store keeps the class itself.
 class HorvaneServiceProtocol {
  public:
   virtual ~HorvaneServiceProtocol() = default;

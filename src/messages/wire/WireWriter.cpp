@@ -12,6 +12,7 @@ std::string_view encodeVarint(std::uint64_t value, char (&buffer)[10]) {
   buffer[size++] = static_cast<char>(value);
   return {buffer, size};
 }
+
 }  // namespace
 
 void WireWriter::key(std::uint32_t tag, std::uint32_t wireType) {
