@@ -136,7 +136,7 @@ int showCarriers(const CarriersOptions& options) {
   // As the product, they live until the process ends.
   const auto log = ToolLog::install(options.isVerbose);
   SimulatedPhone::Options description{options.device, documents.path(),
-                                              simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)};
+                                      simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)};
   description.isConsoleShown = options.isVerbose;
   static auto* phone = new SimulatedPhone(std::move(description));
   static const auto* bar = new CarrierBar;

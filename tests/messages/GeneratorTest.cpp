@@ -124,11 +124,16 @@ TEST_F(GeneratorTest, NamesOfTheBaseClassAreRefused) {
             "Sample.read_from: the member name is taken; give it another with the option `member`");
 }
 
-TEST_F(GeneratorTest, KeywordsAreRefused) {
-  for (const std::string key : {"class", "struct", "while", "true"})
-    EXPECT_EQ(refusal(fileWithField("name: '" + key + "' label: LABEL_OPTIONAL type: TYPE_UINT32")),
-              "Sample." + key + ": the member name is taken; give it another with the option `member`");
+class GeneratorKeywordTest : public GeneratorTest, public testing::WithParamInterface<const char*> {};
+
+TEST_P(GeneratorKeywordTest, IsRefusedAsTheNameOfAField) {
+  const std::string keyword = GetParam();
+  EXPECT_EQ(refusal(fileWithField("name: '" + keyword + "' label: LABEL_OPTIONAL type: TYPE_UINT32")),
+            "Sample." + keyword + ": the member name is taken; give it another with the option `member`");
 }
+
+INSTANTIATE_TEST_SUITE_P(Keywords, GeneratorKeywordTest, testing::Values("class", "struct", "while", "true"),
+                         [](const auto& keyword) { return std::string(keyword.param); });
 
 TEST_F(GeneratorTest, MessageThatContainsItselfIsRefused) {
   EXPECT_EQ(refusal(fileWithField("name: 'a' label: LABEL_OPTIONAL type: TYPE_MESSAGE type_name: '.Sample'")),
