@@ -76,7 +76,7 @@ TEST_F(EdgeCaseMetricsTest, AnIncompleteHomeNetworkStaysAListAndEndsTheWalk) {
   EXPECT_TRUE(log.has("attribute value or value type is empty"));
 }
 
-TEST_F(EdgeCaseMetricsTest, RatRetentionIsDecodedByTheClassOfItsNeighbourOnPurpose) {
+TEST_F(EdgeCaseMetricsTest, RatRetentionIsDecodedByTheClassOfItsNeighbourAsMeant) {
   serviceStarts();
   metricArrives(kRatRetention, Payload().number(3, 1).number(10, 77));
   EXPECT_EQ(rowGroups(), (std::vector<std::string>{"MISC/Cellular RatRetention"}));

@@ -105,7 +105,7 @@ TEST_F(IceMetricsTest, WithoutTimestampTheCarriersGetNone) {
             dictionaryOf({{"0-section-pci", 1}}));
 }
 
-TEST_F(IceMetricsTest, AnEmptyCarrierCostsTheOneBehindItOnPurpose) {
+TEST_F(IceMetricsTest, AnEmptyCarrierCostsTheOneBehindItAsMeant) {
   const auto carriers = [](std::initializer_list<MetricDictionary> elements) {
     return parsed("3CD313", dictionaryOf({{"timestamp", 7}, {"scc_list", listOf(elements)}}));
   };

@@ -126,7 +126,7 @@ TEST(MetricGroupV2Test, TheFamiliesHaveTheirNumbersOfRowsAndSeparateIds) {
   EXPECT_EQ(ice, 39);
 }
 
-TEST(MetricGroupV2Test, TwelveRowsNameNoClassOnPurpose) {
+TEST(MetricGroupV2Test, TwelveRowsNameNoClassAsMeant) {
   std::vector<std::pair<int, std::string>> missing;
   int number = 0;
   for (const MetricGroupV2& row : MetricGroupV2::metricGroupData()) {

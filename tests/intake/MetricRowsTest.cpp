@@ -130,7 +130,7 @@ TEST_F(MetricRowsTest, Integers) {
   EXPECT_EQ(rowOf(false), "0 INT");
 }
 
-TEST_F(MetricRowsTest, FloatsAreOfTypeIntOnPurpose) {
+TEST_F(MetricRowsTest, FloatsAreOfTypeIntAsMeant) {
   EXPECT_EQ(rowOf(decodedFloat(2.5F)), "2.5 INT");
   EXPECT_EQ(rowOf(decodedFloat(0.1F)), "0.1 INT");
   EXPECT_EQ(rowOf(decodedFloat(-12.25F)), "-12.25 INT");

@@ -86,7 +86,7 @@ TEST_F(MetricServiceTest, TheTablesOfTheService) {
   EXPECT_EQ(MetricService::dlbwlookup, (std::array<float, 6>{1.4F, 3, 5, 10, 15, 20}));
 }
 
-TEST_F(MetricServiceTest, TheListOfNewIdsRepeatsOneOnPurpose) {
+TEST_F(MetricServiceTest, TheListOfNewIdsRepeatsOneAsMeant) {
   EXPECT_EQ(MetricService::newMetricHexIds,
             (std::array<std::string_view, 19>{"C4F57", "C5018", "C5019", "C7407", "C1002", "C300C", "C3E02", "C3E0B",
                                               "CA101", "CA103", "CA123", "CC006", "CC007", "CC008", "CC226", "C7505",
@@ -249,7 +249,7 @@ TEST_F(MetricServiceTest, EachRowWithoutClassLogsForItself) {
       << "the rule of this id is never reached: its rows name no class";
 }
 
-TEST_F(MetricServiceTest, TheRadioLinkFailureIsDecodedByTwoClassesOnPurpose) {
+TEST_F(MetricServiceTest, TheRadioLinkFailureIsDecodedByTwoClassesAsMeant) {
   serviceStarts();
   // Tags 2 and 15 belong to the one class, 6 and 11 to the other.
   metricArrives(kNrRadioLinkFailure, Payload().number(2, 4).number(6, 0).signedNumber(11, -101).number(15, 1));

@@ -65,7 +65,7 @@ TEST_F(ValueConversionTest, ABandwidthOfZeroStays) {
   EXPECT_EQ(processValue("dl_bw", "00"), " MHz");
 }
 
-TEST_F(ValueConversionTest, AnUnknownBandwidthReadsAsABareUnitOnPurpose) {
+TEST_F(ValueConversionTest, AnUnknownBandwidthReadsAsABareUnitAsMeant) {
   deviceHasChipset("mav20");
   for (const char* value : {"7", "", "fifty", "50.0", " 50", "50 ", "-50", "99999999999999999999", "+", "+-50"})
     EXPECT_EQ(processValue("dl_bw", value), " MHz") << '"' << value << '"';

@@ -87,6 +87,16 @@ TEST_F(TextFileTest, AFileThatAppearsWhileTheTextIsWrittenStays) {
   EXPECT_THAT(filesInFolder(), ElementsAre("export.txt"));
 }
 
+TEST_F(TextFileTest, ANameMayBeAsLongAsTheFileSystemTakes) {
+  const std::string longest(255, 'n');
+  ASSERT_TRUE(writeTextFile(folder.path() / longest, textOf({"x"}), Overwrite::no));
+  EXPECT_THAT(filesInFolder(), ElementsAre(longest));
+  const auto size = writeTextFile(folder.path() / (longest + 'n'), textOf({"x"}), Overwrite::no);
+  ASSERT_FALSE(size);
+  EXPECT_EQ(size.error().reason, "File name too long");
+  EXPECT_THAT(filesInFolder(), ElementsAre(longest));
+}
+
 TEST_F(TextFileTest, AFolderThatIsMissingIsTold) {
   const auto size = writeTextFile(folder.path() / "missing" / "export.txt", textOf({"x"}), Overwrite::no);
   ASSERT_FALSE(size);

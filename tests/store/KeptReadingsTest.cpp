@@ -64,7 +64,7 @@ TEST_F(KeptReadingsTest, OfTheRowsOfOneSecondTheFirstCountsBeforeAndAfter) {
   EXPECT_EQ(values(contents("dl_freq").result), Row{"1"});
 }
 
-TEST_F(KeptReadingsTest, AnAnswerFromMemoryPrintsTheLibrarysTextTooOnPurpose) {
+TEST_F(KeptReadingsTest, AnAnswerFromMemoryPrintsTheLibrarysTextTooAsMeant) {
   insert(reading());
   warmUp();
   platform.console.lines.clear();
@@ -191,7 +191,7 @@ TEST_F(KeptReadingsTest, ARowThatThisProgramDoesNotWriteLeavesTheTableToTheState
   }
 }
 
-TEST_F(KeptReadingsTest, AValueThatMeansAColumnInDoubleQuotesIsLeftToTheStatementOnPurpose) {
+TEST_F(KeptReadingsTest, AValueThatMeansAColumnInDoubleQuotesIsLeftToTheStatementAsMeant) {
   insert(reading("subs_id", "1"));
   insert(reading("0", "2"));
   warmUp();

@@ -155,7 +155,7 @@ TEST_F(PersistanceStoreDeathTest, AFileThatCannotBeOpenedStopsTheProcess) {
 
 // Tables that cannot be created.
 
-TEST_F(PersistanceStoreTest, WhenTheFirstTableFailsAFailureAndThenASuccessAreReportedOnPurpose) {
+TEST_F(PersistanceStoreTest, WhenTheFirstTableFailsAFailureAndThenASuccessAreReportedAsMeant) {
   test::RawDatabase(path()).run("CREATE TABLE t(x); CREATE INDEX Metric ON t(x)");
   start();
   EXPECT_EQ(databaseLines(),
@@ -352,7 +352,7 @@ TEST_F(DefaultDashboardTest, AMavDeviceGetsFourteenPinsForEachSubscription) {
   EXPECT_EQ(databaseLines(), std::vector<LogLine>(28, {"database", LogLevel::Default, "inserted successfully"}));
 }
 
-TEST_F(DefaultDashboardTest, AnyOtherDeviceGetsThirteenWithAnExtraMncForSubscriptionOneOnPurpose) {
+TEST_F(DefaultDashboardTest, AnyOtherDeviceGetsThirteenWithAnExtraMncForSubscriptionOneAsMeant) {
   onDevice("ice19");
   start();
   load();
@@ -388,7 +388,7 @@ TEST_F(DefaultDashboardTest, ARowThatFailsIsLoggedAndDoesNotStopTheOthersNorTheS
       log.has({"database", LogLevel::Default, "insert dashboard failed, error: Prepare(message: \"refused\")"}));
 }
 
-TEST_F(DefaultDashboardTest, RowsThatDoNotPrepareAreLoggedAndStillASuccessIsReportedOnPurpose) {
+TEST_F(DefaultDashboardTest, RowsThatDoNotPrepareAreLoggedAndStillASuccessIsReportedAsMeant) {
   start();
   test::RawDatabase(path()).run("DROP TABLE Dashboard");
   EXPECT_TRUE(load().success);

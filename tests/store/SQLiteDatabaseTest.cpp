@@ -296,7 +296,7 @@ TEST_F(SQLiteDatabaseTest, RetentionThatDoesNotPrepareFailsOnTheMainQueue) {
                                    "(sqlite3_step)"}}));
 }
 
-TEST_F(SQLiteDatabaseTest, RetentionWhoseStepFailsLogsTheLibrarysTextAndSpeaksOfATableOnPurpose) {
+TEST_F(SQLiteDatabaseTest, RetentionWhoseStepFailsLogsTheLibrarysTextAndSpeaksOfATableAsMeant) {
   openWithTables();
   lockByAnother();
   const Written outcome = deleteOlderRows();
@@ -338,7 +338,7 @@ TEST_F(SQLiteDatabaseTest, ADashboardStatementThatDoesNotPrepareFailsOnTheMainQu
   EXPECT_EQ(outcome.place, Place::main);
 }
 
-TEST_F(SQLiteDatabaseTest, ADashboardStatementWhoseStepFailsReportsPrepareOnTheDatabasesQueueOnPurpose) {
+TEST_F(SQLiteDatabaseTest, ADashboardStatementWhoseStepFailsReportsPrepareOnTheDatabasesQueueAsMeant) {
   openWithTables();
   const Written outcome = execute("INSERT INTO Dashboard (metric_tech) VALUES (\"LTE\");");
   EXPECT_FALSE(outcome.result);
@@ -381,7 +381,7 @@ TEST_F(SQLiteDatabaseTest, AnUnpinThatDoesNotPrepareFailsOnTheMainQueue) {
   EXPECT_TRUE(log.lines().empty());
 }
 
-TEST_F(SQLiteDatabaseTest, AnUnpinWhoseStepFailsReportsPrepareOnTheDatabasesQueueOnPurpose) {
+TEST_F(SQLiteDatabaseTest, AnUnpinWhoseStepFailsReportsPrepareOnTheDatabasesQueueAsMeant) {
   openWithTables();
   lockByAnother();
   const Written outcome = unpin("LTE", "dl_freq", 0);

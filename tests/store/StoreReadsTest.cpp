@@ -76,7 +76,7 @@ TEST_F(StoreReadsTest, NoRowsAreNoError) {
   }
 }
 
-TEST_F(StoreReadsTest, AFailedPrepareOfTheListTheDashboardAndTheExportCarriesADescriptionOnPurpose) {
+TEST_F(StoreReadsTest, AFailedPrepareOfTheListTheDashboardAndTheExportCarriesADescriptionAsMeant) {
   run("DROP TABLE Metric");
   run("DROP TABLE Dashboard");
   const SQLiteError noMetric = prepareError("Prepare(message: \"no such table: Metric\")");
@@ -93,7 +93,7 @@ TEST_F(StoreReadsTest, AFailedPrepareOfContentsAndHistoryComesAsItWasThrown) {
   expectFailure(history(kMonthly), error, Place::main);
 }
 
-TEST_F(StoreReadsTest, ANullTextOfTheListCompletesOnTheDatabasesQueueOnPurpose) {
+TEST_F(StoreReadsTest, ANullTextOfTheListCompletesOnTheDatabasesQueueAsMeant) {
   insert(reading());
   insertRowWith("metric_tech", "NULL");
   run("UPDATE Metric SET metric_name = 'Z' WHERE metric_tech IS NULL");
@@ -119,12 +119,12 @@ TEST_F(StoreReadsTest, ANullTextOfTheHistoryCompletesOnTheMainQueue) {
   }
 }
 
-TEST_F(StoreReadsTest, ANullTextOfTheDashboardCompletesOnTheDatabasesQueueOnPurpose) {
+TEST_F(StoreReadsTest, ANullTextOfTheDashboardCompletesOnTheDatabasesQueueAsMeant) {
   run("INSERT INTO Dashboard (metric_id, metric_name, attribute_name, subs_id) VALUES ('1', 'N', 'a', 0)");
   expectFailure(dashboard(), emptyQueryResult(), Place::database);
 }
 
-TEST_F(StoreReadsTest, ANullTextOfTheExportCompletesOnTheDatabasesQueueOnPurpose) {
+TEST_F(StoreReadsTest, ANullTextOfTheExportCompletesOnTheDatabasesQueueAsMeant) {
   for (const char* column : {"metric_tech", "attribute_name", "attribute_value"}) {
     run("DELETE FROM Metric");
     insert(reading());
@@ -141,7 +141,7 @@ TEST_F(StoreReadsTest, ADateThatDoesNotParseCountsAsNowInTheList) {
   EXPECT_EQ(listed.result.at("LTE").front().collectedOn, platform.time.now());
 }
 
-TEST_F(StoreReadsTest, ADateThatDoesNotParseEndsContentsAndExportOnTheDatabasesQueueOnPurpose) {
+TEST_F(StoreReadsTest, ADateThatDoesNotParseEndsContentsAndExportOnTheDatabasesQueueAsMeant) {
   insertRowWith("collected_on", "'yesterday'");
   expectFailure(contents(), emptyQueryResult(), Place::database);
   expectFailure(contents("dl_freq"), emptyQueryResult(), Place::database);
@@ -274,7 +274,7 @@ TEST_F(StoreReadsTest, ContentsKeepTechnologiesAndSubscriptionsApart) {
   EXPECT_TRUE(contents().result.empty());
 }
 
-TEST_F(StoreReadsTest, AGoodReadOfContentsPrintsTheLibrarysTextOnPurpose) {
+TEST_F(StoreReadsTest, AGoodReadOfContentsPrintsTheLibrarysTextAsMeant) {
   insert(reading());
   contents();
   contents("dl_freq");
@@ -320,7 +320,7 @@ TEST_F(StoreReadsTest, DailyHistoryHoldsTheReadingsOfTheCurrentSubscription) {
   EXPECT_EQ(values(history(kDaily).result), Row{"8"});
 }
 
-TEST_F(StoreReadsTest, DailyHistoryIsOfTheSubscriptionThatIsCurrentWhenItRunsOnPurpose) {
+TEST_F(StoreReadsTest, DailyHistoryIsOfTheSubscriptionThatIsCurrentWhenItRunsAsMeant) {
   insert(reading("dl_freq", "7", "2026-01-05 07:00:00", 0));
   insert(reading("dl_freq", "8", "2026-01-05 07:00:00", 1));
   Read read;
@@ -330,7 +330,7 @@ TEST_F(StoreReadsTest, DailyHistoryIsOfTheSubscriptionThatIsCurrentWhenItRunsOnP
   EXPECT_EQ(values(read.result), Row{"8"});
 }
 
-TEST_F(StoreReadsTest, WeeklyAndMonthlyHistoryAverageEachDayOverBothSubscriptionsOnPurpose) {
+TEST_F(StoreReadsTest, WeeklyAndMonthlyHistoryAverageEachDayOverBothSubscriptionsAsMeant) {
   insert(reading("dl_freq", "5", "2026-01-03 08:00:00", 0));
   insert(reading("dl_freq", "6", "2026-01-03 23:59:59", 1));
   insert(reading("dl_freq", "10", "2026-01-04 00:00:00", 1));
@@ -362,7 +362,7 @@ TEST_F(StoreReadsTest, ANameWithASingleQuoteBreaksTheAveragesAndOneWithADoubleQu
 
 // The dashboard.
 
-TEST_F(StoreReadsTest, TheDashboardIsSortedByRawNameAndMergesEqualNamesOnPurpose) {
+TEST_F(StoreReadsTest, TheDashboardIsSortedByRawNameAndMergesEqualNamesAsMeant) {
   const auto add = [&](const char* name, const char* attribute, std::int32_t subsId) {
     execute(SQLTable<Metric>::insertDashboardItem({"LTE", "803010", name, attribute, subsId}));
   };
@@ -424,7 +424,7 @@ TEST(EnumeratorPrefixTest, EachPrefixIsRemoved) {
     EXPECT_EQ(cleaned(std::string(prefix) + "value"), "value") << prefix;
 }
 
-TEST(EnumeratorPrefixTest, TheRachResultNeedsItsBlankOnPurpose) {
+TEST(EnumeratorPrefixTest, TheRachResultNeedsItsBlankAsMeant) {
   EXPECT_EQ(cleaned("RACH_RESULT_SUCCESS"), "RACH_RESULT_SUCCESS");
 }
 

@@ -1,37 +1,16 @@
-#include <future>
-
 #include <gtest/gtest.h>
 
 #include "app/HardwareManager.h"
-#include "base/SerialQueue.h"
 #include "store/DBManager.h"
 #include "store/MetricStatements.h"
 #include "support/FakePlatform.h"
 #include "support/Reading.h"
+#include "support/ThreadedQueues.h"
 #include "support/TimeZone.h"
 #include "support/VirtualTimeVfs.h"
 
 namespace quorl {
 namespace {
-
-/// Keeps what it made, so that a test can wait for the threads: one may still be handing its last answer to the main
-/// queue when that answer has long been taken.
-struct ThreadedQueues final : QueueFactory {
-  std::shared_ptr<Queue> makeSerialQueue(std::string label) override {
-    return made.emplace_back(std::make_shared<SerialQueue>(std::move(label)));
-  }
-  void join() {
-    // A task may hold the last reference to its own queue; behind this one there is none left.
-    for (const auto& queue : made) {
-      std::promise<void> reached;
-      queue->async([&reached] { reached.set_value(); });
-      reached.get_future().wait();
-    }
-    made.clear();
-  }
-
-  std::vector<std::shared_ptr<Queue>> made;
-};
 
 /// The database on a thread of its own and the main queue on the test's.
 class StoreThreadsTest : public testing::Test {
@@ -56,7 +35,7 @@ class StoreThreadsTest : public testing::Test {
   test::FakePlatform fake;
   test::VirtualTimeVfs vfs{fake.time};
   test::ScopedTimeZone zone{"UTC"};
-  ThreadedQueues queues;
+  test::ThreadedQueues queues;
   LoopQueue main{"main"};
   Platform platform{main,           main,           queues,          fake.time,    fake.properties,
                     fake.resources, fake.documents, fake.strings,    fake.console, fake.alerts,

@@ -143,7 +143,7 @@ TEST_F(TimeTest, AChangeOfZoneLeavesEarlierRowsAtTheirWallClock) {
   EXPECT_EQ(run("SELECT collected_on FROM Metric"), std::vector<Row>{{"2026-01-05 18:00:00"}});
 }
 
-TEST_F(TimeTest, OfAnHourThatOccursTwiceTheFirstIsReadBackOnPurpose) {
+TEST_F(TimeTest, OfAnHourThatOccursTwiceTheFirstIsReadBackAsMeant) {
   inZone("America/New_York");
   Metric metric = reading();
   metric.collectedOn = utcDate("2025-11-02 06:30:00");  // the second half past one

@@ -48,7 +48,7 @@ TEST_F(HorvaneServiceStartTest, ActivationWithASimRemovedRebuildsTheListWithoutI
   EXPECT_EQ(rowsOfSecond(), before);
 }
 
-TEST_F(HorvaneServiceStartTest, TwoActivationsBeforeAnAnswerDoubleTheListOnPurpose) {
+TEST_F(HorvaneServiceStartTest, TwoActivationsBeforeAnAnswerDoubleTheListAsMeant) {
   insertSim(1, "Testnet One");
   start();
   platform.time.advance(5s);

@@ -17,6 +17,7 @@
 #include "shell/NotificationNames.h"
 #include "support/FakePlatform.h"
 #include "support/RowsOnlyStore.h"
+#include "support/ThreadedQueues.h"
 #include "telephony/HorvaneService.h"
 
 namespace quorl::test {
@@ -24,16 +25,6 @@ namespace {
 
 using namespace std::chrono_literals;
 namespace event = simulator::telephony_event;
-
-/// Keeps the queues that the product and the simulator make, so that a test can wait for them.
-class KeepingFactory final : public QueueFactory {
- public:
-  std::shared_ptr<Queue> makeSerialQueue(std::string label) override {
-    queues.push_back(std::make_shared<SerialQueue>(std::move(label)));
-    return queues.back();
-  }
-  std::vector<std::shared_ptr<Queue>> queues;
-};
 
 /// A store with a thread of its own, as the real one has. Reads that found nothing complete there, those that found
 /// rows on the main queue.
@@ -108,27 +99,19 @@ class HorvaneServiceThreadsTest : public ::testing::Test {
     return info;
   }
 
-  static void wait(Queue& queue, std::function<void()> work) {
-    std::promise<void> done;
-    queue.async([&] {
-      work();
-      done.set_value();
-    });
-    done.get_future().wait();
-  }
-  void onMain(std::function<void()> work) { wait(*main_, std::move(work)); }
+  void onMain(const std::function<void()>& work) { runOn(*main_, work); }
 
   /// Waits until nothing is left to do: no chain of answers hops more often than this.
   void drain() {
     for (int hop = 0; hop < 12; ++hop) {
-      for (const auto& queue : factory_.queues) wait(*queue, [] {});
+      factory_.drain();
       onMain([] {});
     }
   }
 
  private:
   FakePlatform fake_;
-  KeepingFactory factory_;
+  ThreadedQueues factory_;
   std::shared_ptr<SerialQueue> main_ = std::make_shared<SerialQueue>("main");
 
  protected:

@@ -30,7 +30,8 @@ bool writeAll(int file, std::string_view piece) {
 /// A file beside its later place, which goes away unless it is moved there.
 class PartFile {
  public:
-  explicit PartFile(const std::filesystem::path& target) : name_(target.string() + ".part-XXXXXX") {
+  // Its name does not grow with that of the target, which may be as long as names can be.
+  explicit PartFile(const std::filesystem::path& target) : name_(target.parent_path() / ".quorl-XXXXXX") {
     file_ = mkostemp(name_.data(), O_CLOEXEC);
     if (file_ < 0) error_ = errno;
   }
