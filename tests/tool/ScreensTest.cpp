@@ -183,6 +183,15 @@ TEST_F(ScreensTool, ControlCharactersOfAStoredTextDoNotReachTheTerminal) {
   EXPECT_THAT(result.output, Not(HasSubstr("\x1b")));
 }
 
+TEST_F(ScreensTool, ControlCharactersOfAStoredNameDoNotReachTheTerminalInASummary) {
+  sql("INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type, "
+      "is_attribute_graphable, metric_id, subs_id, collected_on) VALUES ('LTE', 'Odd' || char(27) || '[31m', 'power', "
+      "'1', 'INT', 0, '1', 0, datetime('now'))");
+  const ToolResult result = tool({"summary"});
+  EXPECT_THAT(result.output, HasSubstr("Odd.[31m"));
+  EXPECT_THAT(result.output, Not(HasSubstr("\x1b")));
+}
+
 // dashboard, pin, unpin
 
 TEST_F(ScreensTool, DashboardPrintsTheDefaultPinsThatHaveReadings) {
