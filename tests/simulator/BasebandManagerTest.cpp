@@ -2,6 +2,8 @@
 #include <memory>
 #include <string>
 #include <thread>
+#include <utility>
+#include <variant>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -15,28 +17,14 @@ namespace quorl::simulator {
 namespace {
 
 using test::clearConfiguration;
+using test::configurationOf;
 using test::queryMetric;
 using zelkor::KeyValueMessage;
 
-constexpr char kConfiguration[] = R"({
-  "applicationId": 2, "payloadType": 0, "profileId": 0,
-  "triggers": [{"triggerId": 5202011, "triggerType": 0, "triggerRef": 9999}],
-  "metrics": [806915, 803010, 827648]
-})";
+const std::string kConfiguration = configurationOf("[806915, 803010, 827648]");
 
 KeyValueMessage addConfiguration(std::string_view content = kConfiguration) {
-  KeyValueMessage message;
-  message.set(zelkor::kKeyAppID, std::int64_t{2});
-  message.set(zelkor::kKeyPayload, ByteString(content));
-  message.set(zelkor::kKeyPayloadType, std::int64_t{0});
-  return message;
-}
-
-/// A configuration with this list of metrics.
-std::string configurationOf(std::string_view metrics) {
-  std::string content(kConfiguration);
-  content.replace(content.find("[806915"), std::string_view("[806915, 803010, 827648]").size(), metrics);
-  return content;
+  return test::addConfiguration(content);
 }
 
 KeyValueMessage without(const KeyValueMessage& message, std::string_view key) {
@@ -298,6 +286,8 @@ TEST_F(SimulatedBaseband, PlaysARecordingAsItIs) {
   subscribe();
   listen();
   EXPECT_TRUE(deliver(4711)) << "not in the configuration";
+  time.settle();
+  EXPECT_EQ(received, std::vector<std::int64_t>{4711});
 }
 
 TEST_F(SimulatedBaseband, AQueryAsksTheHostForAllThatIsConfigured) {

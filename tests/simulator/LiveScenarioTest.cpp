@@ -1,4 +1,3 @@
-#include <algorithm>
 #include <chrono>
 #include <memory>
 #include <optional>
@@ -8,24 +7,14 @@
 #include <utility>
 #include <vector>
 
-#include <fmt/format.h>
 #include <gtest/gtest.h>
 
-#include "app/HardwareManager.h"
 #include "hosts/simulator/LiveScenario.h"
-#include "hosts/simulator/ScenarioFiles.h"
-#include "hosts/simulator/history/BulkIntake.h"
-#include "hosts/simulator/history/History.h"
-#include "intake/ZelkorWrapper.h"
-#include "messages/MessageTable.h"
 #include "messages/MetricCodable.h"
 #include "simulator/ManagerCommands.h"
-#include "store/PersistanceStore.h"
-#include "store/RawDatabase.h"
-#include "support/FakePlatform.h"
+#include "simulator/network/TestScenarios.h"
 #include "support/SteppedQueue.h"
 #include "support/TemporaryDirectory.h"
-#include "support/TimeZone.h"
 
 namespace quorl::simulator {
 namespace {
@@ -33,8 +22,8 @@ namespace {
 using std::chrono::milliseconds;
 using std::chrono::seconds;
 
-ScenarioChoice city(std::uint64_t seed = 1) {
-  return {findScenario("city", {QUORL_SOURCE_DIR "/resources"}).value(), seed, metrics::Family::Mav};
+ScenarioChoice city() {
+  return {network::shippedScenario("city"), 1, metrics::Family::Mav};
 }
 
 constexpr std::int64_t kServingCellInfo = 803010;
@@ -47,9 +36,11 @@ class LiveScenarioTest : public testing::Test {
     time.settle();  // the modem's last task holds the modem, and with it its queue
   }
   void phoneIsIn(LiveScenario::Options options) {
-    auto made = LiveScenario::make(std::move(options), {library, &telephony, time, *mainQueue, time});
+    auto made = LiveScenario::make(std::move(options),
+                                   {library, &telephony, time, *mainQueue, time, [this] { return isBehind; }, log});
     ASSERT_TRUE(made) << made.error();
     scenario = *std::move(made);
+    scenario->setObserver([this](const network::ModemEvent& event, const auto&) { lastMs = event.atMs; });
     library.RegisterEventHandler(client, zelkor::kEventMetric,
                                  [this](const zelkor::KeyValueMessage& message, const auto&) {
                                    received.push_back(message.integer(zelkor::kKeyMetricID).value_or(-1));
@@ -61,14 +52,7 @@ class LiveScenarioTest : public testing::Test {
     return library.PerformCommand(client, command, message, response).code;
   }
   void clientWants(std::string_view metrics) {
-    zelkor::KeyValueMessage message;
-    message.set(zelkor::kKeyAppID, std::int64_t{2});
-    message.set(zelkor::kKeyPayload,
-                ByteString(fmt::format(R"({{"applicationId":2,"payloadType":0,"profileId":0,"triggers":)"
-                                       R"([{{"triggerId":5202011,"triggerType":0,"triggerRef":9999}}],"metrics":{}}})",
-                                       metrics)));
-    message.set(zelkor::kKeyPayloadType, std::int64_t{0});
-    ASSERT_EQ(perform(zelkor::kCommandAddConfiguration, message), 0);
+    ASSERT_EQ(perform(zelkor::kCommandAddConfiguration, test::addConfiguration(test::configurationOf(metrics))), 0);
   }
   void clientWantsNothingMore() {
     ASSERT_EQ(perform(zelkor::kCommandClearConfiguration, test::clearConfiguration()), 0);
@@ -89,8 +73,11 @@ class LiveScenarioTest : public testing::Test {
   BasebandManager library;
   TelephonySimulator telephony{time};
   std::shared_ptr<zelkor::client::Manager> client = library.CreateManager("quorl", time.makeStepped("delivery"));
+  bool isBehind = false;  // the phone, with its work
+  const std::shared_ptr<BasebandLog> log = std::make_shared<BasebandLog>();
   std::unique_ptr<LiveScenario> scenario;
   std::vector<std::int64_t> received;
+  network::SimulatedMs lastMs = 0;  // of the last event of the world
   test::TemporaryDirectory directory;
 };
 
@@ -132,27 +119,20 @@ TEST_F(LiveScenarioTest, AQueryBringsASnapshotAtOnce) {
 
 TEST_F(LiveScenarioTest, TimePassesWithTheClockByTheSpeed) {
   phoneIsIn({city(), 4, std::nullopt});
-  std::uint64_t last = 0;
-  scenario->setObserver([&last](const auto& event, const auto&) { last = event.atMs; });
   time.advance(seconds(60));
-  EXPECT_EQ(last, 0U) << "not before it starts";
+  EXPECT_EQ(lastMs, 0U) << "not before it starts";
   scenario->start();
   time.advance(seconds(60));
-  EXPECT_NEAR(static_cast<double>(last), 240000, 3000);
+  EXPECT_NEAR(static_cast<double>(lastMs), 240000, 3000);
   scenario->stop();
   time.settle();
-  const auto stopped = last;
+  const auto stopped = lastMs;
   time.advance(seconds(60));
-  EXPECT_EQ(last, stopped);
+  EXPECT_EQ(lastMs, stopped);
 }
 
 TEST_F(LiveScenarioTest, MetricsBearTheTimeAtWhichTheyCome) {
-  const auto log = std::make_shared<BasebandLog>();
-  bool isBehind = false;
-  auto made = LiveScenario::make({city(), 20},
-                                 {library, &telephony, time, *mainQueue, time, [&isBehind] { return isBehind; }, log});
-  ASSERT_TRUE(made) << made.error();
-  scenario = *std::move(made);
+  phoneIsIn({city(), 20});
   log->open();
   const auto comesNow = [&] {
     time.advance(seconds(5));
@@ -185,59 +165,46 @@ TEST_F(LiveScenarioTest, MetricsBearTheTimeAtWhichTheyCome) {
 
 TEST_F(LiveScenarioTest, AClockThatJumpsMovesTheWorldByASecondAtMost) {
   phoneIsIn({city()});
-  std::uint64_t last = 0;
-  scenario->setObserver([&last](const auto& event, const auto&) { last = event.atMs; });
   scenario->start();
   time.advance(seconds(30));
   time.setNow(time.now() + std::chrono::hours(5));
   time.advance(seconds(30));
-  EXPECT_LT(last, 62000U);
+  EXPECT_LT(lastMs, 62000U);
   time.setNow(time.now() - std::chrono::hours(5));
   time.advance(seconds(30));
-  EXPECT_GT(last, 80000U);
+  EXPECT_GT(lastMs, 80000U);
 }
 
 TEST_F(LiveScenarioTest, WaitsForAProductThatCannotKeepUp) {
   phoneIsIn({city()});
-  std::uint64_t last = 0;
-  scenario->setObserver([&last](const auto& event, const auto&) { last = event.atMs; });
   scenario->start();
   time.advance(seconds(10));
-  const auto before = last;
+  const auto before = lastMs;
   mainQueue->setHanging(true);
   time.advance(seconds(60));
-  EXPECT_LE(last, before + 1000);
+  EXPECT_LE(lastMs, before + 1000);
   mainQueue->setHanging(false);
   time.advance(seconds(10));
-  EXPECT_GT(last, before + 5000);
+  EXPECT_GT(lastMs, before + 5000);
 }
 
 TEST_F(LiveScenarioTest, StandsStillWhileThePhoneIsBehind) {
-  bool isBehind = false;
-  auto made =
-      LiveScenario::make({city()}, {library, &telephony, time, *mainQueue, time, [&isBehind] { return isBehind; }});
-  ASSERT_TRUE(made) << made.error();
-  scenario = *std::move(made);
-  std::uint64_t last = 0;
-  scenario->setObserver([&last](const auto& event, const auto&) { last = event.atMs; });
+  phoneIsIn({city()});
   scenario->start();
   time.advance(seconds(10));
-  const auto before = last;
+  const auto before = lastMs;
   EXPECT_GT(before, 5000U);
   isBehind = true;
   time.advance(seconds(60));
-  EXPECT_EQ(last, before);
+  EXPECT_EQ(lastMs, before);
   isBehind = false;
   time.advance(seconds(10));
-  EXPECT_GT(last, before + 5000);
-  EXPECT_LT(last, before + 15000) << "what it stood is not made up for";
+  EXPECT_GT(lastMs, before + 5000);
+  EXPECT_LT(lastMs, before + 15000) << "what it stood is not made up for";
 }
 
 TEST_F(LiveScenarioTest, ACaptureSeesAllThatTheBasebandDoes) {
-  const auto log = std::make_shared<BasebandLog>();
-  auto made = LiveScenario::make({city()}, {library, &telephony, time, *mainQueue, time, {}, log});
-  ASSERT_TRUE(made) << made.error();
-  scenario = *std::move(made);
+  phoneIsIn({city()});
   driveOn(seconds(10));
   log->open();
   driveOn(seconds(30));
@@ -271,6 +238,7 @@ TEST_F(LiveScenarioTest, RecordsWhatItDelivers) {
   EXPECT_TRUE(recording->faults.empty());
   std::vector<std::int64_t> recorded;
   for (const RecordedEvent& event : recording->events) recorded.push_back(*event.metricID);
+  EXPECT_FALSE(recorded.empty());
   EXPECT_EQ(recorded, taken());
   EXPECT_EQ(recorded.size(), scenario->events());
 }
@@ -293,102 +261,6 @@ TEST_F(LiveScenarioTest, OneThatHasGoneAnswersNothing) {
   clientAsks();
   time.advance(seconds(10));
   EXPECT_TRUE(taken().empty());
-}
-
-TEST(RecordingWriterTest, AFullDiskIsToldAtTheEnd) {
-  auto writer = RecordingWriter::open("/dev/full");
-  ASSERT_TRUE(writer);
-  RecordedEvent event;
-  event.metricID = 803010;
-  event.payload = ByteString(std::string(100000, 'x'));
-  for (int i = 0; i < 3; ++i) writer->write(event);
-  const auto closed = writer->close();
-  ASSERT_FALSE(closed);
-  EXPECT_EQ(closed.error(), "No space left on device");
-}
-
-/// A platform of family Mav, and files of rows.
-class HistoryTest : public testing::Test {
- protected:
-  HistoryTest() { platform.properties.texts["BasebandChipset"] = "mav"; }
-  HistoryPlan plan(int days) const {
-    HistoryPlan made{city(), days, platform.time.now()};
-    made.session = std::chrono::minutes(1);
-    return made;
-  }
-  std::vector<test::Row> query(const char* sql) { return test::RawDatabase(file).run(sql); }
-
-  test::FakePlatform platform;
-  test::ScopedTimeZone zone{"UTC"};
-  const std::filesystem::path file = platform.directory.path() / "history.sqlite";
-};
-
-TEST_F(HistoryTest, HasSessionsOnEveryDayUpToNowAndNoneLater) {
-  const auto times = sessionTimes(plan(30));
-  EXPECT_GE(times.size(), 30U * 4 - 4);
-  EXPECT_LE(times.size(), 31U * 4);
-  EXPECT_TRUE(std::is_sorted(times.begin(), times.end()));
-  EXPECT_GE(times.front(), platform.time.now() - std::chrono::hours(24 * 30));
-  EXPECT_LT(times.back(), platform.time.now());
-  EXPECT_EQ(times, sessionTimes(plan(30)));
-}
-
-TEST_F(HistoryTest, FillsEveryDayWithRows) {
-  int steps = 0;
-  const auto made = writeHistory(file, plan(3), [&steps](const HistoryProgress& so) {
-    EXPECT_EQ(so.sessionsDone, ++steps);
-    EXPECT_LE(so.sessionsDone, so.sessions);
-  });
-  ASSERT_TRUE(made) << made.error();
-  EXPECT_EQ(made->sessionsDone, made->sessions);
-  EXPECT_GT(made->rows, 1000U);
-  EXPECT_EQ(query("SELECT count(*) FROM Metric"), (std::vector<test::Row>{{std::to_string(made->rows)}}));
-  EXPECT_EQ(query("SELECT DISTINCT date(collected_on) FROM Metric ORDER BY 1"),
-            (std::vector<test::Row>{{"2026-01-02"}, {"2026-01-03"}, {"2026-01-04"}, {"2026-01-05"}}));
-  EXPECT_EQ(query("SELECT count(*) FROM Metric WHERE collected_on > '2026-01-05 09:30:12'"),
-            (std::vector<test::Row>{{"0"}}));
-  EXPECT_EQ(query("SELECT count(*) > 10 FROM Metric WHERE is_attribute_graphable = 1"), (std::vector<test::Row>{{"1"}}))
-      << "graphs have something to show";
-}
-
-TEST_F(HistoryTest, IsTheSameForTheSamePlan) {
-  ASSERT_TRUE(writeHistory(file, plan(1), {}));
-  const auto first = query("SELECT * FROM Metric ORDER BY Id");
-  std::filesystem::remove(file);
-  ASSERT_TRUE(writeHistory(file, plan(1), {}));
-  EXPECT_EQ(query("SELECT * FROM Metric ORDER BY Id"), first);
-}
-
-TEST_F(HistoryTest, TellsWhichFileCannotBeWritten) {
-  const auto made = writeHistory(platform.directory.path() / "no" / "folder.sqlite", plan(1), {});
-  ASSERT_FALSE(made);
-  EXPECT_EQ(made.error(),
-            (platform.directory.path() / "no" / "folder.sqlite").string() + ": unable to open database file");
-}
-
-TEST_F(HistoryTest, OfARecordedWayHasTheRowsOfTheWayItself) {
-  ScenarioRun run(city(7), 1767605400000);
-  std::vector<RecordedEvent> lived;
-  run.advance(std::chrono::minutes(2), [&lived](RecordedEvent event) { lived.push_back(std::move(event)); });
-  const auto recordingFile = platform.directory.path() / "way.jsonl";
-  auto writer = RecordingWriter::open(recordingFile);
-  ASSERT_TRUE(writer);
-  for (const RecordedEvent& event : lived) writer->write(event);
-  ASSERT_TRUE(writer->close());
-  const auto recording = readRecording(recordingFile);
-  ASSERT_TRUE(recording);
-
-  std::vector<std::vector<test::Row>> rows;
-  for (const auto& events : {lived, recording->events}) {
-    auto intake = BulkIntake::open(file);
-    ASSERT_TRUE(intake);
-    for (const RecordedEvent& event : events) (*intake)->take(event);
-    ASSERT_TRUE((*intake)->finish());
-    rows.push_back(query("SELECT * FROM Metric ORDER BY Id"));
-    std::filesystem::remove(file);
-  }
-  EXPECT_GT(rows[0].size(), 500U);
-  EXPECT_TRUE(rows[0] == rows[1]);
 }
 
 }  // namespace

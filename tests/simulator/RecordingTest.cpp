@@ -1,4 +1,5 @@
 #include <limits>
+#include <optional>
 #include <sstream>
 #include <string>
 
@@ -6,6 +7,7 @@
 
 #include "hosts/simulator/Base64.h"
 #include "hosts/simulator/Recording.h"
+#include "hosts/simulator/RecordingWriter.h"
 #include "platform/ZelkorClient.h"
 #include "support/TemporaryDirectory.h"
 
@@ -131,6 +133,7 @@ TEST(RecordingFile, LeavesOutBadLinesAndGoesOn) {
   const Recording recording = readRecording(input);
   ASSERT_EQ(recording.events.size(), 3U);
   EXPECT_EQ(recording.events[0].metricID, 1);
+  EXPECT_EQ(recording.events[1].metricID, 2);
   EXPECT_EQ(recording.events[2].metricID, 3);
   ASSERT_EQ(recording.faults.size(), 2U);
   EXPECT_EQ(recording.faults[0].line, 2U);
@@ -152,6 +155,18 @@ TEST(RecordingFile, ThatCannotBeReadSaysWhy) {
   const auto folder = readRecording(directory.path());
   ASSERT_FALSE(folder);
   EXPECT_EQ(folder.error(), "is a directory");
+}
+
+TEST(RecordingWriter, AFullDiskIsToldAtTheEnd) {
+  auto writer = RecordingWriter::open("/dev/full");
+  ASSERT_TRUE(writer);
+  RecordedEvent event;
+  event.metricID = 803010;
+  event.payload = ByteString(std::string(100000, 'x'));
+  for (int i = 0; i < 3; ++i) writer->write(event);
+  const auto closed = writer->close();
+  ASSERT_FALSE(closed);
+  EXPECT_EQ(closed.error(), "No space left on device");
 }
 
 }  // namespace

@@ -1,14 +1,19 @@
 #include <algorithm>
+#include <chrono>
 #include <cstdint>
+#include <filesystem>
+#include <iterator>
 #include <map>
-#include <memory>
+#include <optional>
 #include <set>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
-#include <fmt/format.h>
 #include <gtest/gtest.h>
 
+#include "hosts/simulator/CatalogueClass.h"
 #include "hosts/simulator/ScenarioFiles.h"
 #include "hosts/simulator/ScenarioRun.h"
 #include "intake/MetricGroupV2.h"
@@ -16,6 +21,7 @@
 #include "intake/ZelkorWrapper.h"
 #include "messages/MessageTable.h"
 #include "messages/MetricCodable.h"
+#include "simulator/network/TestScenarios.h"
 #include "support/FakePlatform.h"
 #include "support/RowsOnlyStore.h"
 
@@ -31,34 +37,27 @@ const char* nameOf(Family family) {
   return family == Family::Mav ? "mav" : "ice";
 }
 
-network::Scenario drive(std::string_view name) {
-  auto scenario = findScenario(name, {QUORL_SOURCE_DIR "/resources"});
-  EXPECT_TRUE(scenario) << name;
-  return scenario ? *std::move(scenario) : network::Scenario();
-}
-
-std::vector<RecordedEvent> eventsOf(std::string_view name, Family family, std::uint64_t seed, minutes length) {
-  ScenarioRun run({drive(name), seed, family}, kStartMs);
+std::vector<RecordedEvent> eventsOf(const std::string& name, Family family, std::uint64_t seed, minutes length) {
+  ScenarioRun run({network::shippedScenario(name), seed, family}, kStartMs);
   std::vector<RecordedEvent> events;
   run.advance(length, [&events](RecordedEvent event) { events.push_back(std::move(event)); });
   return events;
-}
-
-/// The class that decodes a row's metrics; some rows have theirs fixed elsewhere.
-std::string classOf(const MetricGroupV2& row) {
-  const std::map<std::int64_t, const char*> fixed = {{806743, "CellularLteConnectionStats"},
-                                                     {827746, "CellularRatLacSrvInfo"}};
-  const auto found = fixed.find(row.zelkorId);
-  return found != fixed.end() ? found->second : std::string(row.className);
 }
 
 /// By id, the class that decodes it. The first row of an id is meant: what its payload was made for.
 std::map<std::int64_t, std::string> decodableIds(Family family) {
   std::map<std::int64_t, std::string> ids;
   for (const MetricGroupV2& row : MetricGroupV2::metricGroupData())
-    if (row.deviceType == nameOf(family) && makeMessage(classOf(row)) != nullptr)
-      ids.try_emplace(row.zelkorId, classOf(row));
+    if (row.deviceType == nameOf(family) && makeMessage(decodingClass(row)) != nullptr)
+      ids.try_emplace(row.zelkorId, decodingClass(row));
   return ids;
+}
+
+/// What an event's payload holds as the class reads it; nothing if it cannot be read whole.
+std::optional<MetricDictionary> decoded(const RecordedEvent& event, const std::string& className) {
+  const auto message = makeMessage(className);
+  message->initWithData(event.payload);
+  return message->dictionaryRepresentation();
 }
 
 /// Counts rows by metric id.
@@ -80,7 +79,7 @@ class CountingStore final : public test::RowsOnlyStore {
 
 class DrivesOfAFamily : public testing::TestWithParam<Family> {
  protected:
-  /// An hour of each drive.
+  /// An hour of each drive but the hostile one.
   static std::vector<RecordedEvent> allDrives() {
     std::vector<RecordedEvent> events;
     for (const char* name : {"city", "motorway", "tunnel", "weak-indoor", "dual-sim", "busy"}) {
@@ -176,9 +175,7 @@ TEST_P(DrivesOfAFamily, KeepTheirValuesInTheRangesOfMeasurements) {
   std::set<std::string> seen;
   for (const RecordedEvent& event : allDrives()) {
     const std::string& className = ids.at(*event.metricID);
-    const auto message = makeMessage(className);
-    message->initWithData(event.payload);
-    const auto dictionary = message->dictionaryRepresentation();
+    const auto dictionary = decoded(event, className);
     ASSERT_TRUE(dictionary) << className;
     expectRanges(*dictionary, className, seen);
     if (testing::Test::HasFailure()) return;
@@ -192,9 +189,7 @@ TEST_P(DrivesOfAFamily, ShowBandwidthsThatTheDisplayKnows) {
   const auto ids = decodableIds(GetParam());
   int shown = 0;
   for (const RecordedEvent& event : eventsOf("city", GetParam(), 1, minutes(20))) {
-    const auto message = makeMessage(ids.at(*event.metricID));
-    message->initWithData(event.payload);
-    const auto dictionary = message->dictionaryRepresentation();
+    const auto dictionary = decoded(event, ids.at(*event.metricID));
     ASSERT_TRUE(dictionary);
     for (const char* key : {"dl_bw", "ul_bw"}) {
       const MetricValue* value = dictionary->find(key);
@@ -210,9 +205,8 @@ TEST_P(DrivesOfAFamily, CarryTheTimeAtWhichTheyCome) {
   const auto ids = decodableIds(GetParam());
   std::uint64_t last = 0;
   for (const RecordedEvent& event : eventsOf("motorway", GetParam(), 3, minutes(10))) {
-    const auto message = makeMessage(ids.at(*event.metricID));
-    message->initWithData(event.payload);
-    const auto dictionary = message->dictionaryRepresentation();
+    const auto dictionary = decoded(event, ids.at(*event.metricID));
+    ASSERT_TRUE(dictionary);
     const MetricValue* timestamp = dictionary->find("timestamp");
     ASSERT_NE(timestamp, nullptr);
     EXPECT_EQ(timestamp->integer(), static_cast<std::int64_t>(kStartMs + *event.atMs));
@@ -242,7 +236,7 @@ TEST_P(DrivesOfAFamily, ComeAtPlausibleRates) {
 }
 
 TEST_P(DrivesOfAFamily, AreQuietOnAPhoneThatLiesStill) {
-  network::Scenario scenario = drive("city");
+  network::Scenario scenario = network::shippedScenario("city");
   scenario.route.resize(1);
   scenario.steps.clear();
   for (network::Sim& sim : scenario.sims) sim.sessionsPerHour = sim.callsPerHour = 0;
@@ -256,7 +250,7 @@ TEST_P(DrivesOfAFamily, AreQuietOnAPhoneThatLiesStill) {
 
 TEST_P(DrivesOfAFamily, AreTheSameForTheSameSeedHoweverTheTimeIsCut) {
   const auto whole = eventsOf("city", GetParam(), 5, minutes(5));
-  ScenarioRun run({drive("city"), 5, GetParam()}, kStartMs);
+  ScenarioRun run({network::shippedScenario("city"), 5, GetParam()}, kStartMs);
   std::vector<RecordedEvent> pieces;
   for (int i = 0; i < 3000; ++i)
     run.advance(std::chrono::milliseconds(100), [&pieces](RecordedEvent event) { pieces.push_back(std::move(event)); });
@@ -281,7 +275,7 @@ TEST_P(DrivesOfAFamily, AreTheSameOnEveryMachine) {
 }
 
 TEST_P(DrivesOfAFamily, ASnapshotBringsWhatIsSoNowForBothSims) {
-  ScenarioRun run({drive("dual-sim"), 1, GetParam()}, kStartMs);
+  ScenarioRun run({network::shippedScenario("dual-sim"), 1, GetParam()}, kStartMs);
   run.advance(minutes(2), [](const RecordedEvent&) {});
   const auto ids = decodableIds(GetParam());
   std::vector<std::int64_t> wanted;
@@ -289,9 +283,7 @@ TEST_P(DrivesOfAFamily, ASnapshotBringsWhatIsSoNowForBothSims) {
   std::map<std::int64_t, std::set<std::int64_t>> brought;
   run.snapshot(wanted, [&](const RecordedEvent& event) {
     EXPECT_EQ(event.atMs, 120000U);
-    const auto message = makeMessage(ids.at(*event.metricID));
-    message->initWithData(event.payload);
-    const auto dictionary = message->dictionaryRepresentation();
+    const auto dictionary = decoded(event, ids.at(*event.metricID));
     ASSERT_TRUE(dictionary);
     const MetricValue* subsId = dictionary->find("subs_id");
     brought[*event.metricID].insert(subsId != nullptr ? subsId->integer().value_or(-1) : -1);
@@ -300,10 +292,10 @@ TEST_P(DrivesOfAFamily, ASnapshotBringsWhatIsSoNowForBothSims) {
   EXPECT_GE(brought.size(), 7U);
   if (GetParam() == Family::Mav) {
     EXPECT_EQ(brought[827648], both) << "service status";
-    EXPECT_EQ(brought[803010].empty(), false) << "LTE serving cell";
+    EXPECT_FALSE(brought[803010].empty()) << "LTE serving cell";
   } else {
     EXPECT_EQ(brought[3986701], both) << "bearers";
-    EXPECT_EQ(brought[3948738].empty(), false) << "LTE serving cell";
+    EXPECT_FALSE(brought[3948738].empty()) << "LTE serving cell";
   }
   int others = 0;
   const std::int64_t none[] = {1};
@@ -321,9 +313,7 @@ TEST_P(DrivesOfAFamily, AHostileMinuteHasDamagedOversizedAndMassesOfMetrics) {
     ASSERT_TRUE(ids.contains(*event.metricID));
     longest = std::max(longest, event.payload->view().size());
     if (event.payload->view().size() > 100000) continue;
-    const auto message = makeMessage(ids.at(*event.metricID));
-    message->initWithData(event.payload);
-    unreadable += message->dictionaryRepresentation() ? 0 : 1;
+    unreadable += decoded(event, ids.at(*event.metricID)) ? 0 : 1;
   }
   EXPECT_GT(unreadable, 20);
   EXPECT_GT(longest, 1000000U);

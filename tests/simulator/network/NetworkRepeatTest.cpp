@@ -1,10 +1,12 @@
+#include <algorithm>
+#include <chrono>
 #include <cstdint>
 #include <map>
 #include <string>
 
 #include <gtest/gtest.h>
 
-#include "simulator/network/DrivenPhone.h"
+#include "simulator/network/TestScenarios.h"
 
 namespace quorl::simulator::network {
 namespace {

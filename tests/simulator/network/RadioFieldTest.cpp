@@ -1,15 +1,15 @@
 #include <cmath>
+#include <numbers>
 #include <string>
 #include <vector>
 
 #include <gtest/gtest.h>
 
-#include "hosts/simulator/network/Arithmetic.h"
 #include "hosts/simulator/network/Bands.h"
 #include "hosts/simulator/network/PathLoss.h"
 #include "hosts/simulator/network/RadioField.h"
 #include "hosts/simulator/network/Route.h"
-#include "simulator/network/DrivenPhone.h"
+#include "simulator/network/TestScenarios.h"
 
 namespace quorl::simulator::network {
 namespace {
@@ -29,10 +29,9 @@ TEST(PathLossTest, FollowsTheTablesOfTr38901) {
   EXPECT_NEAR(street.outOfSight(200, std::log10(200)), 22.4 + 35.3 * std::log10(200) + 21.3 * std::log10(3.5), 0.01);
 
   const PathLoss rural(Environment::RuralMacro, 0.8, 35.0);
-  const double pi = 3.14159265358979;
   const double roofs = std::pow(5.0, 1.72);
-  const double near = 20.0 * std::log10(40.0 * pi * 500 * 0.8 / 3.0) + 0.03 * roofs * std::log10(500) - 0.044 * roofs +
-                      0.002 * std::log10(5.0) * 500;
+  const double near = 20.0 * std::log10(40.0 * std::numbers::pi * 500 * 0.8 / 3.0) + 0.03 * roofs * std::log10(500) -
+                      0.044 * roofs + 0.002 * std::log10(5.0) * 500;
   EXPECT_NEAR(rural.inSight(500, std::log10(500)), near, 0.01);
   const double hidden = 161.04 - 7.1 * std::log10(20.0) + 7.5 * std::log10(5.0) -
                         (24.37 - 3.7 * (5.0 / 35.0) * (5.0 / 35.0)) * std::log10(35.0) +
@@ -102,7 +101,7 @@ TEST(RouteTest, GoesFromPointToPointAndWaits) {
   EXPECT_GT(last, 900);
 }
 
-/// One site a kilometre away, passed by at a distance at which nothing but the shadowing changes much.
+/// One site with two cells, which send alike in all directions; tests put the phone where they want it.
 constexpr const char* kPlain = R"(
 network n 001-01 N
 layer n b3 lte band=3 channel=1300 width=20
@@ -114,6 +113,7 @@ point 0 1500
 
 constexpr const char* kHall = "zone hall -5000 300 5000 350 loss=20\n";
 
+/// What is received of a cell, in dBm; -200 where it is too weak to be received.
 double powerAt(RadioField& field, const Surroundings& place, SimulatedMs now, std::uint16_t cell) {
   for (const RadioField::Received& received : field.receive(0, place, now))
     if (received.cell == cell) return received.power;
@@ -152,7 +152,7 @@ TEST(RadioFieldTest, ShadowsAreAlikeNearbyAndNotFurtherOn) {
   EXPECT_NEAR(correlation(30), 0.0, 0.08);
 }
 
-TEST(RadioFieldTest, AsksTwiceAtATimeGetTheSame) {
+TEST(RadioFieldTest, AskedTwiceAtOneTimeItAnswersTheSame) {
   const Scenario scenario = scenarioOf(kPlain);
   const Network network(scenario);
   RadioField field(scenario, network, 5);
@@ -196,7 +196,10 @@ TEST(RadioFieldTest, NothingArrivesStrongerThanTheLeastCouplingLossAllows) {
   const Network network(scenario);
   for (std::uint64_t seed = 0; seed < 50; ++seed) {
     RadioField field(scenario, network, seed);
-    EXPECT_LE(powerAt(field, Surroundings{}, 0, 0), network.sector(0).elementPower / 100.0 - 70.0);
+    const double most = network.sector(0).elementPower / 100.0 - 70.0;
+    const double power = powerAt(field, Surroundings{}, 0, 0);
+    EXPECT_LE(power, most);
+    EXPECT_GT(power, most - 30.0) << "below the mast";
   }
 }
 

@@ -1,18 +1,21 @@
+#include <filesystem>
 #include <sstream>
 #include <string>
 #include <utility>
+#include <variant>
 #include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "simulator/network/DrivenPhone.h"
+#include "hosts/simulator/ScenarioFiles.h"
+#include "simulator/network/TestScenarios.h"
 
 namespace quorl::simulator::network {
 namespace {
 
 using ::testing::ElementsAre;
-using ::testing::IsEmpty;
+using ::testing::ElementsAreArray;
 
 constexpr const char* kSmall = R"(
 about "One site"
@@ -32,6 +35,7 @@ std::vector<std::string> problems(const std::string& text) {
 }
 
 TEST(ScenarioReadingTest, TheShippedScenariosRead) {
+  EXPECT_THAT(scenarioNames({QUORL_SOURCE_DIR "/resources"}), ElementsAreArray(kShippedScenarios));
   for (const char* name : kShippedScenarios) {
     const Scenario scenario = shippedScenario(name);
     EXPECT_EQ(scenario.name, name);

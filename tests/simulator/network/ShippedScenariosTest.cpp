@@ -1,10 +1,11 @@
-#include <array>
+#include <chrono>
 #include <map>
-#include <set>
+#include <string>
+#include <variant>
 
 #include <gtest/gtest.h>
 
-#include "simulator/network/DrivenPhone.h"
+#include "simulator/network/TestScenarios.h"
 
 // What each scenario is there to show.
 
@@ -60,6 +61,7 @@ Drive drive(const std::string& scenario, std::chrono::milliseconds duration, std
 
 TEST(ShippedScenariosTest, TheCityHasEveryKindOfEvent) {
   const Drive city = drive("city", 3h);
+  // The last kind is a cue, which only a script gives.
   for (std::size_t kind = 0; kind + 1 < std::variant_size_v<ModemEventBody>; ++kind)
     EXPECT_TRUE(city.events.contains(kind)) << "kind " << kind;
   EXPECT_EQ(city.measurements.size(), 4U) << "GSM, UMTS, LTE and NR";

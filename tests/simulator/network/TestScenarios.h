@@ -1,7 +1,5 @@
 #pragma once
 
-#include <chrono>
-#include <cstdint>
 #include <filesystem>
 #include <sstream>
 #include <string>
@@ -14,9 +12,11 @@
 
 namespace quorl::simulator::network {
 
+/// By their names, sorted.
 inline constexpr const char* kShippedScenarios[] = {"busy",     "city",   "dual-sim",   "hostile",
                                                     "motorway", "tunnel", "weak-indoor"};
 
+/// A scenario that ships with the product. One with a bad line fails the test.
 inline Scenario shippedScenario(const std::string& name) {
   const auto reading =
       readScenario(std::filesystem::path(QUORL_SOURCE_DIR) / "resources" / "scenarios" / (name + ".scenario"));
@@ -24,6 +24,7 @@ inline Scenario shippedScenario(const std::string& name) {
   return reading.scenario;
 }
 
+/// The scenario that a text describes. A bad line fails the test.
 inline Scenario scenarioOf(const std::string& text) {
   std::istringstream input(text);
   const auto reading = readScenario(input, "test.scenario");
