@@ -1,3 +1,4 @@
+#include <filesystem>
 #include <fstream>
 #include <optional>
 #include <string>
@@ -5,7 +6,6 @@
 
 #include <gtest/gtest.h>
 #include <sqlite3.h>
-#include <sys/stat.h>
 
 #include "app/HardwareManager.h"
 #include "hosts/simulator/Recording.h"
@@ -87,9 +87,10 @@ TEST_P(BulkIntakeTest, MakesTheTableThatTheProductMakes) {
 
 TEST_P(BulkIntakeTest, TheProductGoesOnBehindAHistory) {
   const auto events = shippedRecording();
+  ASSERT_FALSE(events.empty());
   auto intake = BulkIntake::open(productsFile());
   ASSERT_TRUE(intake);
-  for (const RecordedEvent& event : events) (*intake)->take(event);
+  for (const RecordedEvent& event : events) ASSERT_TRUE((*intake)->take(event));
   ASSERT_TRUE((*intake)->finish());
   EXPECT_EQ(query(productsFile(), "SELECT count(*) FROM sqlite_master WHERE name = 'Dashboard'"),
             (std::vector<test::Row>{{"0"}}))
@@ -123,9 +124,7 @@ TEST_F(BulkStoreTest, KeepsTheFileForItsUserAlone) {
   ASSERT_TRUE(store);
   (*store)->insertMetric(row("1"), {});
   ASSERT_TRUE((*store)->finish());
-  struct stat status {};
-  ASSERT_EQ(stat(file.c_str(), &status), 0);
-  EXPECT_EQ(status.st_mode & 0777U, 0600U);
+  EXPECT_EQ(fs::status(file).permissions(), fs::perms(0600));
 }
 
 TEST_F(BulkStoreTest, LeavesAFileThatIsWholeWithoutItsLog) {

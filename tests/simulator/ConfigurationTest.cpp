@@ -1,4 +1,7 @@
+#include <ostream>
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
@@ -55,7 +58,8 @@ TEST(ConfigurationOfTheManager, TellsMetricsAndTriggers) {
 TEST(ConfigurationOfTheManager, ThatIsEmptyOrNoObjectIsRefused) {
   EXPECT_EQ(refusal(""), (Refusal{CommandCode::EmptyConfiguration, "the configuration is empty"}));
   for (const char* content : {"configuration", "[]", "{", "\xff\xfe", "7"})
-    EXPECT_EQ(refusal(content), (Refusal{CommandCode::UnreadableConfiguration, "the configuration is no JSON object"}));
+    EXPECT_EQ(refusal(content), (Refusal{CommandCode::UnreadableConfiguration, "the configuration is no JSON object"}))
+        << content;
 }
 
 TEST(ConfigurationOfTheManager, NamesEveryMissingAndEveryForeignKey) {

@@ -38,13 +38,18 @@ TEST(HostilePayloads, SixInARowAreDamagedInSixWays) {
   EXPECT_GE(unreadable, 4) << "turned bits and noise may happen to make sense";
 }
 
-TEST(HostilePayloads, AreTheSameForTheSameSaltAndNumber) {
+TEST(HostilePayloads, AreTheSameForTheSameSaltAndNumberAlone) {
   for (std::uint32_t number = 0; number < 12; ++number)
     EXPECT_EQ(damaged(attempt(), 7, number), damaged(attempt(), 7, number));
+  EXPECT_NE(damaged(attempt(), 7, 5), damaged(attempt(), 7, 11)) << "noise";
+  EXPECT_NE(damaged(attempt(), 7, 5), damaged(attempt(), 8, 5));
 }
 
 TEST(HostilePayloads, CanBeMadeOfNothing) {
-  for (std::uint32_t number = 0; number < 12; ++number) damaged(ByteString(), 7, number);
+  int empty = 0;
+  for (std::uint32_t number = 0; number < 12; ++number)
+    empty += damaged(ByteString(), 7, number).view().empty() ? 1 : 0;
+  EXPECT_EQ(empty, 2) << "there are no bits to turn";
 }
 
 TEST(HostilePayloads, OneThatIsInflatedStillReads) {

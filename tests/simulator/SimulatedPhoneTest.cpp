@@ -1,12 +1,13 @@
-#include <atomic>
 #include <chrono>
+#include <filesystem>
 #include <fstream>
 #include <functional>
 #include <memory>
+#include <optional>
+#include <string>
 #include <vector>
 
 #include <gtest/gtest.h>
-#include <sys/stat.h>
 
 #include "hosts/simulator/SimulatedPhone.h"
 #include "support/FakePlatform.h"
@@ -17,12 +18,6 @@ namespace quorl::simulator {
 namespace {
 
 namespace fs = std::filesystem;
-
-mode_t permissions(const fs::path& path) {
-  struct stat status {};
-  EXPECT_EQ(stat(path.c_str(), &status), 0);
-  return status.st_mode & 0777;
-}
 
 TEST(TrackedQueue, IsAtRestWhenTheLastTaskHasEnded) {
   test::VirtualTime time;
@@ -134,17 +129,17 @@ TEST(FixedDocumentsDirectory, IsMadeForItsUserAlone) {
   const test::TemporaryDirectory directory;
   const fs::path wanted = directory.path() / "new" / "documents";
   EXPECT_EQ(FixedDocumentsDirectory(wanted).path(), wanted);
-  EXPECT_EQ(permissions(wanted), 0700U);
+  EXPECT_EQ(fs::status(wanted).permissions(), fs::perms(0700));
   const fs::path withSlash = directory.path() / "other" / "";
   EXPECT_EQ(FixedDocumentsDirectory(withSlash).path(), withSlash);
-  EXPECT_EQ(permissions(withSlash), 0700U);
+  EXPECT_EQ(fs::status(withSlash).permissions(), fs::perms(0700));
 }
 
 TEST(FixedDocumentsDirectory, ThatIsThereKeepsItsPermissions) {
   const test::TemporaryDirectory directory;
   fs::permissions(directory.path(), fs::perms(0750));
   EXPECT_EQ(FixedDocumentsDirectory(directory.path()).path(), directory.path());
-  EXPECT_EQ(permissions(directory.path()), 0750U);
+  EXPECT_EQ(fs::status(directory.path()).permissions(), fs::perms(0750));
 }
 
 TEST(FixedDocumentsDirectory, ThatCannotBeMadeIsNone) {
@@ -182,9 +177,13 @@ TEST(KeptShare, KeepsTheTextThatWasSharedLast) {
   share.share({"", [](const SharedText::Sink& sink) { sink("one"); }});
   share.share({"", [](const SharedText::Sink& sink) { sink("two"); }});
   EXPECT_EQ(share.text(), "two");
+}
+
+TEST(KeptPasteboard, KeepsTheTextThatWasCopiedLast) {
   KeptPasteboard pasteboard;
-  pasteboard.setText("three");
-  EXPECT_EQ(pasteboard.text(), "three");
+  pasteboard.setText("one");
+  pasteboard.setText("two");
+  EXPECT_EQ(pasteboard.text(), "two");
 }
 
 }  // namespace

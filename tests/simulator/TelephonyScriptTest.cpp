@@ -1,8 +1,11 @@
 #include <filesystem>
 #include <fstream>
+#include <ostream>
 #include <set>
 #include <sstream>
 #include <string>
+#include <utility>
+#include <variant>
 #include <vector>
 
 #include <gmock/gmock.h>
@@ -106,6 +109,7 @@ TEST(TelephonyScriptTest, ReadsFailuresAndRecoveries) {
 TEST(TelephonyScriptTest, ReadsConnections) {
   const auto connection =
       only<event::Connection>(R"({"atMs":0,"event":"connection","slot":1,"type":"Ims","status":"Connecting"})");
+  EXPECT_EQ(connection.slot, 1);
   EXPECT_EQ(connection.type, HVDataConnectionType::Ims);
   EXPECT_EQ(connection.status, HVDataConnectionStatus::Connecting);
 }

@@ -51,12 +51,9 @@ class TelephonySimulatorTest : public ::testing::Test {
  protected:
   TelephonySimulatorTest() { client->setDelegate(listener); }
 
-  template <typename Event>
-  void perform(Event step) {
-    phone->perform(step);
-  }
+  void perform(const event::Event& step) { phone->perform(step); }
 
-  /// Presence of a SIM by slot, or the error's text.
+  /// Presence of a SIM by slot; on an error none, and its text goes to `failure`.
   std::vector<std::pair<int, bool>> subscriptions(std::string* failure = nullptr) {
     std::vector<std::pair<int, bool>> result;
     client->getSubscriptionInfo([&](const auto& info, const auto& error) {
@@ -276,7 +273,7 @@ TEST_F(TelephonySimulatorTest, ScriptHappensAtItsTimesAndItsBeginningAtOnce) {
 
 TEST_F(TelephonySimulatorTest, StepsToComeAreDroppedWithTheSimulator) {
   phone->play({{100ms, event::SimInserted{1, std::nullopt}}}, *main);
-  client.reset();
+  client.reset();  // keeps the simulated phone alive otherwise
   phone.reset();
   time.advance(1s);
   EXPECT_THAT(listener->told, IsEmpty());

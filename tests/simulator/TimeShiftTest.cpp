@@ -29,7 +29,7 @@ class TimeShift : public testing::Test {
   static constexpr std::int64_t kContext = 3986700;  // KCellularEmmContext
 };
 
-TEST_F(TimeShift, MovesAllTimesBySameSpanSoThatTheLatestIsNow) {
+TEST_F(TimeShift, MovesAllTimesByTheSameSpanSoThatTheLatestIsNow) {
   // 1000 ms becomes 2000 ms, and 900 ms becomes 1900 ms, wherever the latest stands.
   EXPECT_EQ(shifted({event(kContext, "08 E8 07 10 02"), event(kContext, "08 84 07")}),
             (std::vector<std::string>{"08 D0 0F 10 02", "08 EC 0E"}));
