@@ -7,8 +7,8 @@
 namespace quorl::test {
 namespace {
 
-constexpr char kWorkedPayload[] = "08e8071002320508ac021005380750017801";
-constexpr char kWorkedJson[] =
+constexpr char kExamplePayload[] = "08e8071002320508ac021005380750017801";
+constexpr char kExampleJson[] =
     R"({"timestamp":1000,"reg_status":"KREG_STATUS_LIMITED_SERVICE","guti":{"mmegi":300,"mmec":5},)"
     R"("reject_cause":"EMM_CAUSE_EPS_SERVICES_NOT_ALLOWED","is_ims_voice_supported":true,"subs_id":1})";
 
@@ -28,9 +28,9 @@ std::string encodeFault(const std::string& json) {
 }
 
 TEST(ToolDecode, PrintsTheExampleMessage) {
-  const ToolResult result = decode("KCellularEmmContext", std::string(kWorkedPayload) + "\n");
+  const ToolResult result = decode("KCellularEmmContext", std::string(kExamplePayload) + "\n");
   EXPECT_EQ(result.exitCode, 0);
-  EXPECT_EQ(result.output, std::string(kWorkedJson) + "\n");
+  EXPECT_EQ(result.output, std::string(kExampleJson) + "\n");
   EXPECT_EQ(result.errors, "");
 }
 
@@ -83,8 +83,8 @@ TEST(ToolDecode, NoInputGivesNoOutput) {
 }
 
 TEST(ToolEncode, WritesTheExampleMessage) {
-  const ToolResult result = encode("KCellularEmmContext", std::string(kWorkedJson) + "\n");
-  EXPECT_EQ(result.output, std::string(kWorkedPayload) + "\n");
+  const ToolResult result = encode("KCellularEmmContext", std::string(kExampleJson) + "\n");
+  EXPECT_EQ(result.output, std::string(kExamplePayload) + "\n");
   EXPECT_EQ(result.exitCode, 0);
 }
 

@@ -1,9 +1,16 @@
+#include <optional>
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include <gtest/gtest.h>
 
 #include "Hexadecimal.h"
 #include "NearestNames.h"
+#include "ProgressBar.h"
+#include "TextTable.h"
+
+// The functions that the subcommands share. All other tests of the tool run it as a program.
 
 namespace quorl::tool {
 namespace {
@@ -33,6 +40,20 @@ TEST(NearestNames, ComeNearestFirstThenInTheirOrder) {
   EXPECT_EQ(nearestNames("cat", {"dog", "cart", "hat", "cat"}, 3),
             (std::vector<std::string_view>{"cat", "cart", "hat"}));
   EXPECT_EQ(nearestNames("cat", {"dog"}, 3), std::vector<std::string_view>{"dog"});
+}
+
+TEST(TerminalText, CountsCharactersAndNotBytes) {
+  EXPECT_EQ(displayWidth("Größe"), 5U);
+  EXPECT_EQ(printable("a\tb\x7f\nGröße"), "a.b..Größe");
+}
+
+TEST(ProgressText, GrowsWithTheShare) {
+  EXPECT_EQ(progressText(0, "rows"), "[>                             ]   0 % rows");
+  EXPECT_EQ(progressText(0.5, "rows"), "[===============>              ]  50 % rows");
+  EXPECT_EQ(progressText(1, "rows"), "[==============================] 100 % rows");
+  EXPECT_EQ(progressText(7, "rows"), progressText(1, "rows"));
+  EXPECT_EQ(progressText(-1, "rows"), progressText(0, "rows"));
+  EXPECT_EQ(progressText(0.0 / 0.0, "rows"), progressText(0, "rows"));
 }
 
 }  // namespace

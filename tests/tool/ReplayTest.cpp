@@ -1,13 +1,14 @@
 #include <csignal>
+#include <cstdint>
 #include <filesystem>
-#include <memory>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include <fmt/format.h>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
-#include <sys/stat.h>
 
 #include "Hexadecimal.h"
 #include "ToolRun.h"
@@ -26,12 +27,6 @@ Rows query(const fs::path& file, const char* sql) {
   Rows rows;
   for (const Row& row : RawDatabase(file).run(sql)) rows.push_back(fmt::format("{}", fmt::join(row, "|")));
   return rows;
-}
-
-mode_t permissions(const fs::path& path) {
-  struct stat status {};
-  EXPECT_EQ(stat(path.c_str(), &status), 0);
-  return status.st_mode & 0777;
 }
 
 class Replay : public testing::Test {
@@ -95,8 +90,8 @@ TEST_F(Replay, StoresARowForEachAttribute) {
 TEST_F(Replay, KeepsWhatItMakesForItsUserAlone) {
   record(kContext, kGoodContext);
   replay("ice15");
-  EXPECT_EQ(permissions(documents), 0700U);
-  EXPECT_EQ(permissions(database), 0600U);
+  EXPECT_EQ(fs::status(documents).permissions(), fs::perms(0700));
+  EXPECT_EQ(fs::status(database).permissions(), fs::perms(0600));
 }
 
 TEST_F(Replay, LeavesADatabaseFileThatIsWholeByItself) {
@@ -220,9 +215,7 @@ TEST_F(Replay, TellsTheDeviceWhatItIs) {
 }
 
 TEST_F(Replay, DeviceThatIsNeitherFamilyPlaysLikeMav) {
-  record(806915,
-         "08e8071802"
-         "7801");
+  record(806915, "08e80718027801");
   const ToolResult result = replay("other");
   EXPECT_EQ(result.exitCode, 0);
   EXPECT_EQ(summaryOf(result)["rowsInserted"], 3);
@@ -233,7 +226,7 @@ TEST_F(Replay, UnknownBasebandPrintsTheDialogAndEndsAsItsButtonDoes) {
   const ToolResult result = replay("unknown");
   EXPECT_EQ(result.exitCode, -SIGABRT);
   EXPECT_EQ(result.output, "");
-  EXPECT_EQ(result.errorLines()[0],
+  EXPECT_EQ(result.errorLines().at(0),
             "Error Occured: Unable to get baseband information. Please try again or file a bug report. [Done]");
 }
 
@@ -350,7 +343,7 @@ TEST_F(Replay, SummaryShowsEachMetricOnce) {
             "LTE         Active Bearers     1  1970-01-01 00:00:01\n"
             "LTE         NAS                5  1970-01-01 00:00:02\n"
             "UMTS        Active Bearers     1  1970-01-01 00:00:01\n");
-  EXPECT_EQ(runTool({"summary", "--json", "--documents", documents.string()}).outputLines()[2],
+  EXPECT_EQ(runTool({"summary", "--json", "--documents", documents.string()}).outputLines().at(2),
             R"({"tech":"LTE","name":"NAS","rows":5,"lastSeen":"1970-01-01 00:00:02"})");
 }
 

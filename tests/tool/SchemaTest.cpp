@@ -1,4 +1,4 @@
-#include <set>
+#include <cstddef>
 #include <string>
 
 #include <gtest/gtest.h>

@@ -1,12 +1,10 @@
 #include <filesystem>
-#include <memory>
 #include <string>
 #include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
-#include <sys/stat.h>
 
 #include "TextTable.h"
 #include "ToolRun.h"
@@ -52,14 +50,18 @@ class ScreensTool : public testing::Test {
   }
 
   void sql(const std::string& text) const { RawDatabase(documents() + "/metricPartV11.sqlite").run(text); }
+  /// Inserts what `rows`, a SELECT or VALUES, gives for the columns of a row in their order.
+  void insert(const std::string& rows) const {
+    sql("INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type, "
+        "is_attribute_graphable, metric_id, subs_id, collected_on) " +
+        rows);
+  }
   /// A row of today, also if midnight passes during the test.
   void stored(const std::string& tech, const std::string& metric, const std::string& attribute,
               const std::string& value, int subsId = 0, const std::string& when = "+1 minutes",
               const std::string& metricId = "803010") const {
-    sql("INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type, "
-        "is_attribute_graphable, metric_id, subs_id, collected_on) VALUES ('" +
-        tech + "', '" + metric + "', '" + attribute + "', '" + value + "', 'INT', 1, '" + metricId + "', " +
-        std::to_string(subsId) + ", datetime('now', '" + when + "'))");
+    insert("VALUES ('" + tech + "', '" + metric + "', '" + attribute + "', '" + value + "', 'INT', 1, '" + metricId +
+           "', " + std::to_string(subsId) + ", datetime('now', '" + when + "'))");
   }
 
   TemporaryDirectory directory;
@@ -175,18 +177,14 @@ TEST_F(ScreensTool, ShowOfNothingIsAFailure) {
 }
 
 TEST_F(ScreensTool, ControlCharactersOfAStoredTextDoNotReachTheTerminal) {
-  sql("INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type, "
-      "is_attribute_graphable, metric_id, subs_id, collected_on) VALUES ('LTE', 'Odd', 'power', char(27) || '[31mred' "
-      "|| char(10), 'STRING', 0, '1', 0, datetime('now'))");
+  insert("VALUES ('LTE', 'Odd', 'power', char(27) || '[31mred' || char(10), 'STRING', 0, '1', 0, datetime('now'))");
   const ToolResult result = tool({"show", "--tech", "LTE", "--metric", "Odd"});
   EXPECT_THAT(result.output, HasSubstr(".[31mred."));
   EXPECT_THAT(result.output, Not(HasSubstr("\x1b")));
 }
 
 TEST_F(ScreensTool, ControlCharactersOfAStoredNameDoNotReachTheTerminalInASummary) {
-  sql("INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type, "
-      "is_attribute_graphable, metric_id, subs_id, collected_on) VALUES ('LTE', 'Odd' || char(27) || '[31m', 'power', "
-      "'1', 'INT', 0, '1', 0, datetime('now'))");
+  insert("VALUES ('LTE', 'Odd' || char(27) || '[31m', 'power', '1', 'INT', 0, '1', 0, datetime('now'))");
   const ToolResult result = tool({"summary"});
   EXPECT_THAT(result.output, HasSubstr("Odd.[31m"));
   EXPECT_THAT(result.output, Not(HasSubstr("\x1b")));
@@ -258,23 +256,29 @@ TEST_F(ScreensTool, UnpinningWhatIsNotPinnedIsAFailure) {
 // history
 
 TEST_F(ScreensTool, HistoryOfADayIsOfOneSubscriptionAndThatOfAWeekOfBoth) {
-  stored("RAT", "Cell Info", "kHVCellMonitorCellId", "10", 0);
-  stored("RAT", "Cell Info", "kHVCellMonitorCellId", "30", 1);
+  // In one statement, so that midnight cannot come between them.
+  insert(
+      "SELECT 'RAT', 'Cell Info', 'kHVCellMonitorCellId', value, 'INT', 1, 'Cell Info', subs_id, "
+      "datetime('now', '+1 minutes') FROM (SELECT '10' AS value, 0 AS subs_id UNION SELECT '30', 1)");
   const Words attribute{"history", "--metric", "Cell Info", "--attribute", "kHVCellMonitorCellId", "--time-frame"};
   const auto with = [&](Words words) {
     words.insert(words.begin(), attribute.begin(), attribute.end());
     return json(words);
   };
-  auto lines = with({"daily"});
-  ASSERT_THAT(lines, SizeIs(1));
-  EXPECT_EQ(lines[0]["value"], "10");
-  EXPECT_EQ(with({"daily", "--subscription", "1"})[0]["value"], "30");
+  const auto daily = with({"daily"});
+  ASSERT_THAT(daily, SizeIs(1));
+  EXPECT_EQ(daily[0]["value"], "10");
+  EXPECT_EQ(with({"daily", "--subscription", "1"}).at(0)["value"], "30");
+  const auto weekly = with({"weekly"});
+  ASSERT_THAT(weekly, SizeIs(1));
+  EXPECT_EQ(weekly[0]["value"], "20.0");
+  EXPECT_EQ(with({"weekly", "--subscription", "1"}), weekly);
 }
 
 TEST_F(ScreensTool, HistoryOfAWeekAveragesEachDay) {
-  sql("INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type, "
-      "is_attribute_graphable, metric_id, subs_id, collected_on) SELECT 'RAT', 'Cell Info', 'kHVCellMonitorCellId', "
-      "value, 'INT', 1, 'Cell Info', 0, datetime('now') FROM (SELECT '10' AS value UNION SELECT '25')");
+  insert(
+      "SELECT 'RAT', 'Cell Info', 'kHVCellMonitorCellId', value, 'INT', 1, 'Cell Info', 0, datetime('now') "
+      "FROM (SELECT '10' AS value UNION SELECT '25')");
   for (const char* frame : {"weekly", "monthly"}) {
     const auto lines =
         json({"history", "--metric", "Cell Info", "--attribute", "kHVCellMonitorCellId", "--time-frame", frame});
@@ -332,6 +336,7 @@ TEST_F(ScreensTool, ExportTakesTheRowsOfItsTimeFrame) {
   stored("LTE", "Tx Power", "power", "1");
   stored("LTE", "Tx Power", "power", "2", 0, "-4 days");
   stored("LTE", "Tx Power", "power", "3", 0, "-20 days");
+  EXPECT_THAT(tool({"export", "--time-frame", "daily"}).output, HasSubstr("attributeValue: 1,"));
   EXPECT_THAT(tool({"export", "--time-frame", "daily"}).output, Not(HasSubstr("attributeValue: 2,")));
   EXPECT_THAT(tool({"export", "--time-frame", "weekly"}).output, HasSubstr("attributeValue: 2,"));
   EXPECT_THAT(tool({"export", "--time-frame", "weekly"}).output, Not(HasSubstr("attributeValue: 3,")));
@@ -351,9 +356,7 @@ TEST_F(ScreensTool, ExportWritesAFileForItsOwnerAlone) {
   EXPECT_EQ(result.exitCode, 0);
   EXPECT_EQ(result.output, "");
   EXPECT_THAT(readFile(file), HasSubstr("attributeValue: 11, "));
-  struct stat status {};
-  ASSERT_EQ(stat(file.c_str(), &status), 0);
-  EXPECT_EQ(status.st_mode & 0777U, 0600U);
+  EXPECT_EQ(std::filesystem::status(file).permissions(), std::filesystem::perms(0600));
 }
 
 TEST_F(ScreensTool, AnExportThatCannotBeWrittenIsAFailure) {
@@ -402,11 +405,6 @@ TEST_F(ScreensTool, TheDatabaseFileIsWholeAfterwards) {
   std::error_code none;
   const auto log = documents() + "/metricPartV11.sqlite-wal";
   EXPECT_TRUE(!std::filesystem::exists(log, none) || std::filesystem::file_size(log) == 0);
-}
-
-TEST(TextTableTest, CountsCharactersAndNotBytes) {
-  EXPECT_EQ(tool::displayWidth("Größe"), 5U);
-  EXPECT_EQ(tool::printable("a\tb\x7f\nGröße"), "a.b..Größe");
 }
 
 }  // namespace
