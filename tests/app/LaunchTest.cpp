@@ -1,6 +1,11 @@
+#include <algorithm>
+#include <chrono>
+#include <cstdio>
 #include <fstream>
 #include <memory>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include <gmock/gmock.h>
@@ -8,16 +13,13 @@
 
 #include "app/AppDelegate.h"
 #include "app/ApplicationLoop.h"
-#include "app/HardwareManager.h"
 #include "base/Log.h"
-#include "store/PersistanceStore.h"
 #include "support/FakePlatform.h"
 
 namespace quorl {
 namespace {
 
 using test::FakePlatform;
-using ::testing::ElementsAre;
 using ::testing::ElementsAreArray;
 using ::testing::IsEmpty;
 using ::testing::SizeIs;
@@ -175,6 +177,7 @@ TEST_F(LaunchTest, DoneEndsTheProcessOfAnUnknownDevice) {
 
 TEST_F(LaunchTest, TheDialogsLineIsLoggedBeforeTheProcessEnds) {
   launch();
+  ASSERT_THAT(phone_.alerts.shown, SizeIs(1));
   struct Printer final : LogSink {
     bool isEnabled(std::string_view, LogLevel) const override { return true; }
     void write(std::string_view category, LogLevel, std::string_view text) override {

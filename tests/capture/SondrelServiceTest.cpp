@@ -233,7 +233,7 @@ TEST_F(SondrelServiceTest, AnErrorInPlaceOfABatchIsLoggedWithoutAScreenToo) {
   launch();
   loseScreen();
   service->didCollectLogs(std::nullopt, error);
-  EXPECT_THAT(log.lines(), SizeIs(1));
+  EXPECT_THAT(log.lines(), ElementsAre(line("SondrelService - didCollectLogs: Capture is busy ", LogLevel::Error)));
 }
 
 TEST_F(SondrelServiceTest, NeitherBatchNorErrorIsNothing) {
