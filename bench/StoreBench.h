@@ -14,7 +14,7 @@
 #include "base/SerialQueue.h"
 #include "store/DBManager.h"
 #include "support/FakePlatform.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 #include "support/VirtualTimeVfs.h"
 
 // What the benches of the store share.

@@ -3,7 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "base/DateText.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 
 namespace quorl {
 namespace {

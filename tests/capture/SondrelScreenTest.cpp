@@ -13,7 +13,7 @@
 #include "capture/SondrelViewController.h"
 #include "support/FakePlatform.h"
 #include "support/LogRecorder.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 
 namespace quorl::test {
 namespace {

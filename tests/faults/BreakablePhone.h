@@ -1,13 +1,12 @@
 #pragma once
 
+#include <chrono>
 #include <cstddef>
-#include <cstdint>
 #include <filesystem>
 #include <functional>
 #include <map>
 #include <memory>
 #include <optional>
-#include <set>
 #include <string>
 #include <string_view>
 
@@ -26,7 +25,7 @@
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
 #include "support/PassingLibrary.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 #include "support/VirtualTimeVfs.h"
 
 namespace quorl::test {

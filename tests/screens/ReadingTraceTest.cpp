@@ -5,7 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "screens/dashboard/ReadingTrace.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 
 namespace quorl {
 namespace {

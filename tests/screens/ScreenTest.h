@@ -15,7 +15,7 @@
 #include "store/PersistanceStore.h"
 #include "support/FakePlatform.h"
 #include "support/LogRecorder.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 
 namespace quorl::test {
 

@@ -7,7 +7,7 @@
 #include "screens/history/GraphView.h"
 #include "screens/metriclist/AllMetricsViewController.h"
 #include "shell/TimeTexts.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 
 // What a person reads of a time: several zones, both kinds of daylight-saving change, two languages.
 

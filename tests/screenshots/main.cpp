@@ -18,7 +18,7 @@
 #include "hosts/simulator/TelephonyScript.h"
 #include "hosts/simulator/TimeShift.h"
 #include "shell/view/Appearance.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 #include "support/VirtualTimeVfs.h"
 #include "support/window/WindowFixture.h"
 

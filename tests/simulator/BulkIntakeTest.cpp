@@ -15,7 +15,7 @@
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
 #include "support/Reading.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 #include "support/VirtualTimeVfs.h"
 
 namespace quorl::simulator {

@@ -5,7 +5,7 @@
 
 #include "hosts/simulator/PhoneServices.h"
 #include "store/DefaultDashboard.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 
 namespace quorl::test {
 namespace {

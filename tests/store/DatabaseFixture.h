@@ -17,7 +17,7 @@
 #include "support/FakePlatform.h"
 #include "support/LogRecorder.h"
 #include "support/Reading.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 #include "support/VirtualTimeVfs.h"
 
 namespace quorl::test {

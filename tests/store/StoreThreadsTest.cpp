@@ -6,7 +6,7 @@
 #include "support/FakePlatform.h"
 #include "support/Reading.h"
 #include "support/ThreadedQueues.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 #include "support/VirtualTimeVfs.h"
 
 namespace quorl {

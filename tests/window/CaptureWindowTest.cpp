@@ -16,7 +16,7 @@
 #include "capture/view/SondrelBinding.h"
 #include "hosts/simulator/SondrelSimulator.h"
 #include "shell/view/Appearance.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 #include "support/window/WindowFixture.h"
 
 namespace quorl {

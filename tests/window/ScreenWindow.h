@@ -10,7 +10,7 @@
 #include <gtest/gtest.h>
 
 #include "store/PersistanceStore.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 #include "support/window/WindowFixture.h"
 
 namespace quorl::test {

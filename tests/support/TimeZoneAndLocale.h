@@ -6,6 +6,19 @@
 
 namespace quorl::test {
 
+/// Sets a variable of the process's environment while it lives.
+class ScopedVariable {
+ public:
+  ScopedVariable(const char* name, const std::string& value);
+  ~ScopedVariable();
+  ScopedVariable(const ScopedVariable&) = delete;
+  ScopedVariable& operator=(const ScopedVariable&) = delete;
+
+ private:
+  const char* const name_;
+  std::optional<std::string> previous_;
+};
+
 /// Sets the process's time zone while it lives, such as "Asia/Tokyo" or "UTC".
 class ScopedTimeZone {
  public:
@@ -15,7 +28,7 @@ class ScopedTimeZone {
   ScopedTimeZone& operator=(const ScopedTimeZone&) = delete;
 
  private:
-  std::optional<std::string> previous_;
+  std::optional<ScopedVariable> variable_;
 };
 
 /// Sets the locale of texts shown while it lives, such as "en_US" or "de_DE".
@@ -38,6 +51,10 @@ class ScopedLanguage {
   ~ScopedLanguage();
   ScopedLanguage(const ScopedLanguage&) = delete;
   ScopedLanguage& operator=(const ScopedLanguage&) = delete;
+
+ private:
+  ScopedVariable variable_;
+  std::string previous_;
 };
 
 }  // namespace quorl::test
