@@ -4,12 +4,12 @@
 #include <memory>
 #include <optional>
 #include <string_view>
-#include <utility>
 
 #include "intake/MetricGroupV2.h"
 #include "intake/MetricService.h"
 #include "intake/ZelkorWrapper.h"
 #include "support/FakePlatform.h"
+#include "support/MetricEvent.h"
 #include "support/RowsOnlyStore.h"
 
 // The first byte chooses the baseband family, the second a row of the catalogue for the metric id, the rest is the
@@ -40,10 +40,7 @@ class Phone {
     service_ = quorl::MetricService::make(store_, quorl::ZelkorWrapper::sharedInstance());
   }
   void deliver(std::int64_t metricId, std::string_view payload) {
-    quorl::zelkor::KeyValueMessage message;
-    message.set(quorl::zelkor::kKeyMetricID, metricId);
-    message.set(quorl::zelkor::kKeyPayload, quorl::ByteString(payload));
-    service_->metricsDidUpdate(message);
+    service_->metricsDidUpdate(quorl::test::metricEvent(metricId, quorl::ByteString(payload)));
   }
 
  private:

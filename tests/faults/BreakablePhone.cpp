@@ -7,8 +7,7 @@
 
 #include <sqlite3.h>
 
-#include "app/HardwareManager.h"
-#include "intake/ZelkorWrapper.h"
+#include "hosts/simulator/EpochTime.h"
 #include "shell/NotificationNames.h"
 #include "store/MetricStatements.h"
 #include "store/PersistanceStore.h"
@@ -94,8 +93,7 @@ void BreakablePhone::metricArrives(const zelkor::KeyValueMessage& event) {
 void BreakablePhone::metricsArrive(std::size_t count, std::chrono::milliseconds step) {
   for (std::size_t i = 0; i < count; ++i) {
     passes(step);
-    const auto now = std::chrono::duration_cast<std::chrono::milliseconds>(host.time.now().time_since_epoch());
-    metricArrives(nasEvent(static_cast<std::uint64_t>(now.count())));
+    metricArrives(nasEvent(simulator::millisecondsSince1970(host.time.now())));
   }
 }
 

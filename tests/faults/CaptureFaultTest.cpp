@@ -1,13 +1,17 @@
-#include <csignal>
+#include <chrono>
+#include <filesystem>
 #include <fstream>
-#include <string>
+#include <iterator>
+#include <memory>
+#include <system_error>
+#include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
 #include "capture/SondrelViewController.h"
 #include "faults/BreakablePhone.h"
+#include "support/FileSizeLimit.h"
 
 namespace quorl::test {
 namespace {
@@ -21,7 +25,6 @@ using ::testing::SizeIs;
 class CaptureFault : public testing::Test {
  protected:
   CaptureFault() {
-    phone.host.properties.texts["BasebandChipset"] = "ice15";
     phone.launch();
     screen->viewDidLoad();
   }
@@ -44,17 +47,10 @@ class CaptureFault : public testing::Test {
 TEST_F(CaptureFault, AChunkThatTheSystemRefusesIsToldAndEarlierFilesStay) {
   captures(4s);
   ASSERT_EQ(files(), 8U);
-  const auto previousHandler = std::signal(SIGXFSZ, SIG_IGN);
-  rlimit limit{};
-  ASSERT_EQ(getrlimit(RLIMIT_FSIZE, &limit), 0);
-  const rlim_t before = limit.rlim_cur;
-  limit.rlim_cur = 16 * 1024;
-  ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &limit), 0);
-  phone.passes(10s);
-  limit.rlim_cur = before;
-  ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &limit), 0);
-  std::signal(SIGXFSZ, previousHandler);
-
+  {
+    const FileSizeLimit limit(16 * 1024);
+    phone.passes(10s);
+  }
   ASSERT_THAT(alerts(), SizeIs(1));
   EXPECT_EQ(alerts()[0].title,
             "A log file cannot be written: File too large. Earlier files are kept. Make room, then start again.");

@@ -1,14 +1,15 @@
+#include <algorithm>
 #include <cerrno>
-#include <csignal>
+#include <cstddef>
 #include <random>
 
 #include <gtest/gtest.h>
 #include <sqlite3.h>
-#include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include "faults/BreakablePhone.h"
+#include "support/FileSizeLimit.h"
 
 namespace quorl::test {
 namespace {
@@ -121,17 +122,10 @@ TEST(FullDisk, FilesThatMayNotGrowAnyMoreCostRowsAndNothingElse) {
   BreakablePhone phone;
   phone.launch();
   phone.metricsArrive(10);
-  const auto previousHandler = std::signal(SIGXFSZ, SIG_IGN);
-  rlimit limit{};
-  ASSERT_EQ(getrlimit(RLIMIT_FSIZE, &limit), 0);
-  const rlim_t before = limit.rlim_cur;
-  limit.rlim_cur = 200'000;
-  ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &limit), 0);
-  phone.metricsArrive(40);
-  limit.rlim_cur = before;
-  ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &limit), 0);
-  std::signal(SIGXFSZ, previousHandler);
-
+  {
+    const FileSizeLimit limit(200'000);
+    phone.metricsArrive(40);
+  }
   EXPECT_GT(phone.lostRows(), 0U);
   EXPECT_EQ(phone.errors->countContaining("disk I/O error"), phone.lostRows());
   const std::size_t lost = phone.lostRows();

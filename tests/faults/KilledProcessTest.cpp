@@ -7,7 +7,6 @@
 #include <set>
 #include <stdexcept>
 #include <string>
-#include <vector>
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
@@ -16,6 +15,7 @@
 #include <unistd.h>
 
 #include "base/Clock.h"
+#include "hosts/simulator/EpochTime.h"
 #include "store/RawDatabase.h"
 #include "support/TemporaryDirectory.h"
 
@@ -51,11 +51,11 @@ class Writer {
     char line[32];
     if (std::fgets(line, sizeof line, reports_.get()) == nullptr) return {};
     std::string report = line;
-    if (!report.empty() && report.back() == '\n') report.pop_back();
+    if (report.back() == '\n') report.pop_back();
     return report;
   }
 
-  /// Kills the process in whatever it is doing and waits for its end.
+  /// Kills the process in whatever it is doing and waits for its end. Answers its status, as `waitpid` does.
   int kill() {
     ::kill(process_, SIGKILL);
     int status = 0;
@@ -88,14 +88,12 @@ class KilledProcess : public testing::Test {
 
 TEST_F(KilledProcess, NoReportedRowIsLostAndTheFileStaysWhole) {
   constexpr int kKills = 200;
-  constexpr std::uint64_t kRoomOfARun = 1'000'000;
-  // Rows of thirty days ago would go at the next start.
-  const auto start = SystemClock().now().time_since_epoch();
-  std::uint64_t firstMs = static_cast<std::uint64_t>(
-      std::chrono::duration_cast<std::chrono::milliseconds>(start).count() - std::int64_t{kKills} * 1'000'000);
+  constexpr std::uint64_t kMsPerRun = 1'000'000;  // one for each metric of a run, and many left over
+  // The last run's metrics are of now; those of thirty days ago would go at the next start.
+  std::uint64_t firstMs = simulator::millisecondsSince1970(SystemClock().now()) - kKills * kMsPerRun;
   std::mt19937 moments(20251121);
   std::set<std::string> reported;
-  for (int kill = 0; kill < kKills; ++kill, firstMs += kRoomOfARun) {
+  for (int kill = 0; kill < kKills; ++kill, firstMs += kMsPerRun) {
     Writer writer(documents, firstMs);
     for (std::size_t left = 1 + moments() % 120; left > 0; --left) {
       const std::string report = writer.nextReport();

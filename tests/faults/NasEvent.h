@@ -1,11 +1,12 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <optional>
 
 #include "messages/classes/nas_context.h"
 #include "messages/wire/WireWriter.h"
-#include "platform/ZelkorClient.h"
+#include "support/MetricEvent.h"
 
 namespace quorl::test {
 
@@ -21,10 +22,7 @@ inline zelkor::KeyValueMessage nasEvent(std::optional<std::uint64_t> timestampMs
   message.setSubsId(0);
   WireWriter writer;
   message.writeTo(writer);
-  zelkor::KeyValueMessage event;
-  event.set(zelkor::kKeyMetricID, kNasMetricId);
-  event.set(zelkor::kKeyPayload, ByteString(writer.bytes()));
-  return event;
+  return metricEvent(kNasMetricId, ByteString(writer.bytes()));
 }
 
 }  // namespace quorl::test

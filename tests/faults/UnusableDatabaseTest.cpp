@@ -1,6 +1,13 @@
+#include <chrono>
+#include <cstddef>
 #include <cstdio>
+#include <cstdlib>
+#include <filesystem>
 #include <fstream>
 #include <random>
+#include <string>
+#include <string_view>
+#include <vector>
 
 #include <grp.h>
 #include <gtest/gtest.h>
@@ -222,10 +229,11 @@ TEST_F(UnusableDatabase, HeldWithoutAJournalItIsNotEvenReadUntilItIsFree) {
   EXPECT_EQ(phone.storedRows(), phone.reportedRows);
 }
 
+constexpr uid_t kNobody = 65534;
+
 /// Root may write everywhere.
 void becomeAnOrdinaryUser() {
   if (geteuid() != 0) return;
-  constexpr uid_t kNobody = 65534;
   if (setgroups(0, nullptr) != 0 || setgid(kNobody) != 0 || setuid(kNobody) != 0) std::_Exit(2);
 }
 
@@ -252,7 +260,7 @@ class ReadOnlyDocuments : public UnusableDatabase {
   }
 
  private:
-  static void give(const fs::path& path) { ASSERT_EQ(chown(path.c_str(), 65534, 65534), 0); }
+  static void give(const fs::path& path) { ASSERT_EQ(chown(path.c_str(), kNobody, kNobody), 0); }
 };
 
 TEST_F(ReadOnlyDocuments, WithoutADatabaseEndTheProcessWithTheReason) {

@@ -1,6 +1,9 @@
+#include <chrono>
+#include <cstddef>
+#include <cstdint>
 #include <ctime>
-#include <optional>
 #include <string>
+#include <vector>
 
 #include <gtest/gtest.h>
 
@@ -121,22 +124,16 @@ TEST_F(UnwillingManagerTest, AHundredThousandMetricsAtOnceBecomeRowsInTheirOrder
 
 constexpr std::size_t kHuge = std::size_t{64} << 20;
 
-/// A metric whose payload has 64 MB, of any kind.
+/// A metric whose payload has 64 MiB, of any kind.
 class HugePayload : public UnwillingManagerTest {
  protected:
-  static zelkor::KeyValueMessage event(std::int64_t metricId, std::string payload) {
-    zelkor::KeyValueMessage message;
-    message.set(zelkor::kKeyMetricID, metricId);
-    message.set(zelkor::kKeyPayload, ByteString(payload));
-    return message;
-  }
   /// The rows that `payload` gives; the product must go on with the next metric as if nothing had been.
-  std::size_t rowsOf(std::int64_t metricId, std::string payload) {
+  std::size_t rowsOf(const std::string& payload) {
     phone.launch();
     EXPECT_GE(payload.size(), kHuge);
     const std::size_t before = phone.reportedRows;
     const Stopwatch watch;
-    phone.metricArrives(event(metricId, std::move(payload)));
+    phone.metricArrives(metricEvent(kNasMetricId, ByteString(payload)));
     figure("ms of the processor for the metric", watch.ms());
     const std::size_t rows = phone.reportedRows - before;
     phone.metricsArrive(1);
@@ -147,25 +144,22 @@ class HugePayload : public UnwillingManagerTest {
 };
 
 TEST_F(HugePayload, OfOctetsWithoutMeaningIsDropped) {
-  EXPECT_EQ(rowsOf(kNasMetricId, std::string(kHuge, '\xFF')), 0U);
+  EXPECT_EQ(rowsOf(std::string(kHuge, '\xFF')), 0U);
 }
 
 TEST_F(HugePayload, ThatClaimsMoreThanItHasIsDropped) {
-  EXPECT_EQ(
-      rowsOf(kNasMetricId, Payload().number(1, 5).key(200, 2).varint(kHuge * 2).raw(std::string(kHuge, 'x')).data()),
-      0U);
+  EXPECT_EQ(rowsOf(Payload().number(1, 5).key(200, 2).varint(kHuge * 2).raw(std::string(kHuge, 'x')).data()), 0U);
 }
 
 TEST_F(HugePayload, OfAFieldThatNobodyKnowsGivesTheRowsOfTheOthers) {
   const ByteString known = *nasEvent(1767605412000).bytes(zelkor::kKeyPayload);
-  EXPECT_EQ(rowsOf(kNasMetricId, Payload().raw(known.view()).bytes(2000, std::string(kHuge, 'x')).data()),
-            kRowsOfNasEvent);
+  EXPECT_EQ(rowsOf(Payload().raw(known.view()).bytes(2000, std::string(kHuge, 'x')).data()), kRowsOfNasEvent);
 }
 
 TEST_F(HugePayload, OfGroupsWithoutEndIsDropped) {
   std::string payload(kHuge, '\xC3');
   for (std::size_t i = 1; i < payload.size(); i += 2) payload[i] = '\x3E';
-  EXPECT_EQ(rowsOf(kNasMetricId, std::move(payload)), 0U);
+  EXPECT_EQ(rowsOf(payload), 0U);
 }
 
 TEST_F(HugePayload, OfOneNumberOverAndOverGivesItsLastValue) {
@@ -173,7 +167,7 @@ TEST_F(HugePayload, OfOneNumberOverAndOverGivesItsLastValue) {
   std::string payload;
   payload.reserve(kHuge + 64);
   while (payload.size() < kHuge) payload += known.view();
-  EXPECT_EQ(rowsOf(kNasMetricId, std::move(payload)), kRowsOfNasEvent);
+  EXPECT_EQ(rowsOf(payload), kRowsOfNasEvent);
 }
 
 }  // namespace

@@ -1,2 +1,2 @@
-// Stands for the headers that all test programs have compiled once; see this folder's CMakeLists.txt.
+// A program for the sake of its precompiled headers, which the test programs take over; see tests/CMakeLists.txt.
 int main() {}

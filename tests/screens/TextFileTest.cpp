@@ -1,15 +1,16 @@
-#include <csignal>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
 #include "screens/export/TextFile.h"
+#include "support/FileSizeLimit.h"
 #include "support/TemporaryDirectory.h"
 
 namespace quorl {
@@ -113,21 +114,14 @@ TEST_F(TextFileTest, AFolderOfThatNameIsNotOverwritten) {
 }
 
 TEST_F(TextFileTest, ADeviceThatIsFullEndsTheTextAndNothingIsLeft) {
-  // More than a file may have: the limit of the process stands for a full device.
-  rlimit before{};
-  ASSERT_EQ(getrlimit(RLIMIT_FSIZE, &before), 0);
-  rlimit small = before;
-  small.rlim_cur = 4096;
-  const auto usual = signal(SIGXFSZ, SIG_IGN);
-  ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &small), 0);
+  std::optional<test::FileSizeLimit> limit(std::in_place, 4096);
   int pieces = 0;
   const SharedText text("export.txt", [&pieces](const SharedText::Sink& sink) {
     const std::string piece(4096, 'x');
     while (sink(piece)) ++pieces;
   });
   const auto size = writeTextFile(file(), text, Overwrite::no);
-  setrlimit(RLIMIT_FSIZE, &before);
-  signal(SIGXFSZ, usual);
+  limit.reset();
   ASSERT_FALSE(size);
   EXPECT_EQ(size.error().reason, "File too large");
   EXPECT_EQ(pieces, 1);

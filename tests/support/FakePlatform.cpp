@@ -1,6 +1,7 @@
 #include "support/FakePlatform.h"
 
 #include <algorithm>
+#include <utility>
 
 #include "app/HardwareManager.h"
 #include "base/NotificationCenter.h"

@@ -3,12 +3,13 @@
 #include <cstdlib>
 #include <stdexcept>
 #include <string>
+#include <system_error>
 
 namespace quorl::test {
 
-TemporaryDirectory::TemporaryDirectory() {
-  std::string name = (std::filesystem::temp_directory_path() / "quorl-test-XXXXXX").string();
-  if (mkdtemp(name.data()) == nullptr) throw std::runtime_error("cannot make a temporary directory");
+TemporaryDirectory::TemporaryDirectory(const std::filesystem::path& parent) {
+  std::string name = (parent / "quorl-XXXXXX").string();
+  if (mkdtemp(name.data()) == nullptr) throw std::runtime_error("cannot make a directory in " + parent.string());
   path_ = name;
 }
 

@@ -7,7 +7,8 @@ namespace quorl::test {
 /// A new empty directory, removed with all that is in it when this goes away.
 class TemporaryDirectory {
  public:
-  TemporaryDirectory();
+  TemporaryDirectory() : TemporaryDirectory(std::filesystem::temp_directory_path()) {}
+  explicit TemporaryDirectory(const std::filesystem::path& parent);
   ~TemporaryDirectory();
   TemporaryDirectory(const TemporaryDirectory&) = delete;
   TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;

@@ -6,8 +6,8 @@
 
 namespace quorl::test {
 
-/// Makes SQLite's 'now' the time of a clock, for connections opened while this lives. All else is the platform's own
-/// file system.
+/// Makes SQLite's 'now' the time of a clock, for connections opened while this lives, none of which may outlive it. All
+/// else is the platform's own file system.
 class VirtualTimeVfs {
  public:
   explicit VirtualTimeVfs(const Clock& clock);
