@@ -1,5 +1,3 @@
-// Scenario files: whatever reads without a problem can be played.
-
 #include <chrono>
 #include <cstddef>
 #include <cstdint>
@@ -9,6 +7,8 @@
 
 #include "hosts/simulator/network/Modem.h"
 #include "hosts/simulator/network/ScenarioReading.h"
+
+// A scenario file. Whatever reads without a problem can be played.
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   namespace network = quorl::simulator::network;

@@ -1,5 +1,6 @@
 #!/usr/bin/env bash
-# Fuzzes every entry, or those named, under address and undefined-behaviour sanitizers: scripts/fuzz.sh SECONDS [TARGET...]
+# scripts/fuzz.sh SECONDS [TARGET...]: fuzzes every entry, or those named, for so long each, under address and
+# undefined-behaviour sanitizers.
 . "$(dirname "${BASH_SOURCE[0]}")/setup.sh"
 seconds=${1:?seconds for each target}
 shift
@@ -8,7 +9,11 @@ build fuzz
 bin=build/fuzz/bin
 "$bin/fuzz_make_seeds" build/fuzz/seeds resources/recordings/*.jsonl
 mkdir -p build/fuzz/seeds/Scenario && cp resources/scenarios/*.scenario build/fuzz/seeds/Scenario
-[ $# -gt 0 ] || set -- MessageReader ProcessMetric RecordingLines HexadecimalInput JsonInput Scenario
+if [ $# -eq 0 ]; then
+  set -- fuzz/*Fuzz.cpp
+  set -- "${@#fuzz/}"
+  set -- "${@%Fuzz.cpp}"
+fi
 for target in "$@"; do
   mkdir -p "build/fuzz/found/$target" "fuzz/corpus/$target"
   echo "$target:"
