@@ -60,5 +60,6 @@ target_link_libraries(quorl_desktop PUBLIC quorl_ui quorl_simulator Qt6::DBus CL
 
 add_executable(quorl-simulator hosts/desktop/main.cpp)
 target_link_libraries(quorl-simulator PRIVATE quorl_desktop quorl_flags)
+add_dependencies(quorl-simulator quorl_strings)
 
 set(CMAKE_AUTOMOC OFF)
