@@ -29,9 +29,10 @@ endforeach()
 add_custom_target(quorl_manuals ALL DEPENDS ${packed_manuals})
 install(FILES ${packed_manuals} DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
 
-# What a Debian package has to say of itself.
-set(CPACK_PACKAGE_CONTACT "The Quorl developers <quorl@localhost>")
+# What a Debian package has to say of itself. Both dates are those of the release.
+set(QUORL_RELEASE_DATE 2026-11-21)
 set(QUORL_CHANGELOG_DATE "Sat, 21 Nov 2026 12:00:00 +0000")
+set(CPACK_PACKAGE_CONTACT "The Quorl developers <quorl@localhost>")
 configure_file(${PROJECT_SOURCE_DIR}/packaging/changelog.in ${CMAKE_BINARY_DIR}/packaging/changelog @ONLY)
 set(packed_changelog ${CMAKE_BINARY_DIR}/packaging/changelog.gz)
 add_custom_command(
@@ -44,7 +45,6 @@ install(FILES ${PROJECT_SOURCE_DIR}/README.md ${PROJECT_SOURCE_DIR}/CHANGELOG.md
         DESTINATION ${CMAKE_INSTALL_DOCDIR})
 
 if(TARGET quorl-simulator)
-  set(QUORL_RELEASE_DATE 2026-11-21)
   configure_file(${PROJECT_SOURCE_DIR}/packaging/com.ardent.quorl.metainfo.xml.in
                  ${CMAKE_BINARY_DIR}/packaging/com.ardent.quorl.metainfo.xml @ONLY)
   install(FILES ${CMAKE_BINARY_DIR}/packaging/com.ardent.quorl.metainfo.xml
@@ -86,9 +86,10 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 if(TARGET quorl-simulator)
   # What QML loads at run time, which no linker sees.
   set(CPACK_DEBIAN_PACKAGE_DEPENDS
-      "qml6-module-qt-labs-folderlistmodel, qml6-module-qtquick, qml6-module-qtquick-controls, qml6-module-qtquick-dialogs, qml6-module-qtquick-layouts, \
-qml6-module-qtquick-shapes, qml6-module-qtquick-templates, qml6-module-qtquick-window, qml6-module-qtqml, \
-qml6-module-qtqml-models, qml6-module-qtqml-workerscript, libqt6svg6, qt6-qpa-plugins")
+      "qml6-module-qt-labs-folderlistmodel, qml6-module-qtqml, qml6-module-qtqml-models, \
+qml6-module-qtqml-workerscript, qml6-module-qtquick, qml6-module-qtquick-controls, qml6-module-qtquick-dialogs, \
+qml6-module-qtquick-layouts, qml6-module-qtquick-shapes, qml6-module-qtquick-templates, qml6-module-qtquick-window, \
+libqt6svg6, qt6-qpa-plugins")
   set(CPACK_DEBIAN_PACKAGE_RECOMMENDS "fonts-inter")
 endif()
 include(CPack)

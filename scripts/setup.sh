@@ -1,4 +1,5 @@
-# Sourced by ./run, ./test and the scripts that build: finds the project's root, installs what is missing, and configures a preset.
+# Sourced by ./run, ./test and the scripts that build: goes to the project's root, installs what is missing, and offers
+# `configure` and `build`.
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 cd "$root"
@@ -25,15 +26,9 @@ install_packages() {
   "${sudo[@]}" env DEBIAN_FRONTEND=noninteractive apt-get install -y -q --no-install-recommends "${missing[@]}" >/dev/null
 }
 
-# configure PRESET [CMAKE ARGUMENTS]: only when the build folder has none of these settings yet.
+# configure PRESET: only when that was not done yet.
 configure() {
-  local preset=$1
-  shift
-  local wanted="$preset $*" stamp="build/$preset/.configured"
-  if [ ! -f "build/$preset/build.ninja" ] || [ "$(cat "$stamp" 2>/dev/null)" != "$wanted" ]; then
-    cmake --preset "$preset" "$@" >/dev/null
-    echo "$wanted" >"$stamp"
-  fi
+  [ -f "build/$1/build.ninja" ] || cmake --preset "$1" >/dev/null
 }
 
 # build PRESET [TARGET...]: quiet unless it fails.
