@@ -3,12 +3,15 @@
 // ratios of the medians are printed, and the ten classes with the largest.
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <optional>
 #include <random>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -16,6 +19,7 @@
 #include <fmt/format.h>
 #include <google/protobuf/message.h>
 
+#include "Medians.h"
 #include "messages/MetricCodable.h"
 #include "messages/RandomMessage.h"
 
@@ -243,33 +247,13 @@ void add(const std::string& name, const std::vector<Sample>& samples, Task task)
       ->ReportAggregatesOnly();
 }
 
-/// The console's lines, and the medians by name.
-class MedianReporter : public benchmark::ConsoleReporter {
- public:
-  void ReportRuns(const std::vector<Run>& runs) override {
-    ConsoleReporter::ReportRuns(runs);
-    for (const Run& run : runs)
-      if (run.aggregate_name == "median") medians_[run.run_name.function_name] = run.GetAdjustedCPUTime();
-  }
-
-  /// 0 if one of the two did not run.
-  double ratio(const std::string& task) const {
-    const auto own = medians_.find(task + "/quorl");
-    const auto other = medians_.find(task + "/protobuf");
-    return own == medians_.end() || other == medians_.end() || other->second <= 0 ? 0 : own->second / other->second;
-  }
-
- private:
-  std::map<std::string, double> medians_;
-};
-
-void printRatios(const MedianReporter& reporter) {
+void printRatios(const bench::MedianReporter& reporter) {
   fmt::print("\nratio of medians, this engine to libprotobuf\n");
   for (const char* task : {"read", "read_and_represent"})
-    if (const double ratio = reporter.ratio(task); ratio > 0) fmt::print("  {:<42} {:.2f}\n", task, ratio);
+    if (const auto ratio = reporter.ratio(task)) fmt::print("  {:<42} {:.2f}\n", task, ratio->processor);
   std::vector<std::pair<double, std::string>> classes;
   for (const char* name : kClasses)
-    if (const double ratio = reporter.ratio(std::string("class/") + name); ratio > 0) classes.emplace_back(ratio, name);
+    if (const auto ratio = reporter.ratio(std::string("class/") + name)) classes.emplace_back(ratio->processor, name);
   std::sort(classes.rbegin(), classes.rend());
   if (classes.size() > 10) classes.resize(10);
   if (!classes.empty()) fmt::print("largest ratios by class, with dictionary\n");
@@ -281,13 +265,7 @@ void printRatios(const MedianReporter& reporter) {
 
 int main(int argc, char** argv) {
   using namespace quorl;
-  // Interleaved repetitions spread what else the machine does over both sides.
-  std::vector<char*> arguments(argv, argv + argc);
-  std::string interleave = "--benchmark_enable_random_interleaving=true";
-  arguments.insert(arguments.begin() + 1, interleave.data());
-  int count = static_cast<int>(arguments.size());
-  benchmark::Initialize(&count, arguments.data());
-  if (benchmark::ReportUnrecognizedArguments(count, arguments.data())) return 1;
+  if (!bench::initialize(argc, argv)) return 1;
 
   add("read/quorl", mixedCorpus(), readWithQuorl);
   add("read/protobuf", mixedCorpus(), readWithProtobuf);
@@ -304,7 +282,7 @@ int main(int argc, char** argv) {
           ->ReportAggregatesOnly()
           ->Iterations(kClassIterations);
   }
-  MedianReporter reporter;
+  bench::MedianReporter reporter("quorl", "protobuf");
   benchmark::RunSpecifiedBenchmarks(&reporter);
   printRatios(reporter);
   return 0;

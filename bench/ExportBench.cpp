@@ -4,6 +4,7 @@
 // and kept; without them, a hundred thousand and the working directory.
 
 #include <chrono>
+#include <cstddef>
 #include <cstdlib>
 #include <functional>
 #include <memory>
@@ -12,8 +13,9 @@
 
 #include <benchmark/benchmark.h>
 #include <fmt/format.h>
-#include <sqlite3.h>
 
+#include "Medians.h"
+#include "Memory.h"
 #include "StoreBench.h"
 #include "screens/export/ExportText.h"
 #include "store/MetricStatements.h"
@@ -22,7 +24,6 @@ namespace quorl {
 namespace {
 
 constexpr int kRepetitions = 5;
-constexpr std::size_t kUsualRows = 100'000;
 constexpr AttributeDetailTimeFrame kMonthly = AttributeDetailTimeFrame::monthly;
 
 void read(SQLiteDatabase& database, bench::Phone& phone, const std::function<void(const ExportedMetrics&)>& handle) {
@@ -36,28 +37,20 @@ void read(SQLiteDatabase& database, bench::Phone& phone, const std::function<voi
   phone.main.run();
 }
 
-void stepBare(SQLiteDatabase& database) {
-  sqlite3_stmt* statement = nullptr;
-  if (sqlite3_prepare_v2(database.dbPointer(), exportStatement(kMonthly), -1, &statement, nullptr) != SQLITE_OK)
-    std::abort();
-  while (sqlite3_step(statement) == SQLITE_ROW) continue;
-  sqlite3_finalize(statement);
-}
-
 void measureMemory(benchmark::State& state, SQLiteDatabase& database, bench::Phone& phone) {
   using Seconds = std::chrono::duration<double>;
   const auto megabytes = [](std::size_t bytes) { return static_cast<double>(bytes) / 1e6; };
   for ([[maybe_unused]] auto _ : state) {
     bench::resetMostMemory();
-    const std::size_t before = bench::memory("VmRSS:");
+    const std::size_t before = bench::memory();
     read(database, phone, [&](const ExportedMetrics& rows) {
       state.counters["rows"] = static_cast<double>(rows.size());
-      state.counters["rows_MB"] = megabytes(bench::memory("VmHWM:") - before);
+      state.counters["rows_MB"] = megabytes(bench::mostMemory() - before);
       const auto start = std::chrono::steady_clock::now();
       const std::string text = exportText(rows);
       state.counters["main_thread_s"] = Seconds(std::chrono::steady_clock::now() - start).count();
       state.counters["text_MB"] = megabytes(text.size());
-      state.counters["peak_MB"] = megabytes(bench::memory("VmHWM:") - before);
+      state.counters["peak_MB"] = megabytes(bench::mostMemory() - before);
     });
   }
 }
@@ -69,14 +62,13 @@ int main(int argc, char** argv) {
   using namespace quorl;
   if (!bench::initialize(argc, argv)) return 1;
   bench::Phone phone;
-  const auto path =
-      bench::monthOfRows(bench::directories({"."}).front(), bench::rowCount(kUsualRows), phone.fake.time.now());
+  const auto path = bench::monthOfRows(bench::directory(), bench::rowCount(), phone.fake.time.now());
   const std::shared_ptr<SQLiteDatabase> database = SQLiteDatabase::open(path.string()).value();
   bench::add("read/store", kRepetitions, [&](benchmark::State& state) {
     for ([[maybe_unused]] auto _ : state) read(*database, phone, [](const ExportedMetrics&) {});
   });
   bench::add("read/bare", kRepetitions, [&](benchmark::State& state) {
-    for ([[maybe_unused]] auto _ : state) stepBare(*database);
+    for ([[maybe_unused]] auto _ : state) bench::stepBare(database->dbPointer(), exportStatement(kMonthly), "");
   });
   benchmark::RegisterBenchmark("read and text",
                                [&](benchmark::State& state) { measureMemory(state, *database, phone); })
@@ -84,7 +76,7 @@ int main(int argc, char** argv) {
       ->UseRealTime()
       ->Unit(benchmark::kMillisecond);
 
-  bench::MedianReporter reporter;
+  bench::MedianReporter reporter("store", "bare");
   benchmark::RunSpecifiedBenchmarks(&reporter);
   if (const auto ratio = reporter.ratio("read"))
     fmt::print("\nratio of medians, the store's read to its statement stepped bare: {:.2f}\n", ratio->real);

@@ -3,20 +3,25 @@
 // the ratios of the medians are printed. QUORL_BENCH_DIR names the directory; without it, it is the working directory
 // and then /dev/shm.
 
+#include <chrono>
+#include <cstddef>
+#include <cstdint>
 #include <cstdlib>
 #include <filesystem>
+#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
 #include <benchmark/benchmark.h>
 #include <fmt/format.h>
-#include <sqlite3.h>
 
+#include "Medians.h"
 #include "StoreBench.h"
 #include "base/DateText.h"
 #include "store/DBManager.h"
 #include "store/MetricStatements.h"
+#include "support/TemporaryDirectory.h"
 
 namespace quorl {
 namespace {
@@ -28,11 +33,11 @@ class Site {
  public:
   explicit Site(const std::filesystem::path& directory) : directory_(directory) {
     database = SQLiteDatabase::open((directory_.path() / "file.sqlite").string()).value();
-    sqlite3_exec(database->dbPointer(), SQLTable<Metric>::createMetricTable, nullptr, nullptr, nullptr);
+    bench::execute(database->dbPointer(), SQLTable<Metric>::createMetricTable);
   }
 
  private:
-  const bench::Directory directory_;  // goes after the database
+  const test::TemporaryDirectory directory_;  // goes after the database
 
  public:
   std::shared_ptr<SQLiteDatabase> database;
@@ -121,7 +126,7 @@ int main(int argc, char** argv) {
     bench::add(task + "/bare", kRepetitions,
                [directory, count](benchmark::State& state) { bareLoop(state, directory, count); });
   }
-  bench::MedianReporter reporter;
+  bench::MedianReporter reporter("store", "bare");
   benchmark::RunSpecifiedBenchmarks(&reporter);
 
   fmt::print("\nratio of medians, the store to the bare loop\n");

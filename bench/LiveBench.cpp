@@ -8,6 +8,8 @@
 #include <algorithm>
 #include <atomic>
 #include <chrono>
+#include <cstddef>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
@@ -23,16 +25,21 @@
 #include <fmt/format.h>
 #include <sys/resource.h>
 
+#include "Memory.h"
 #include "StoreBench.h"
 #include "app/HardwareManager.h"
+#include "hosts/simulator/EpochTime.h"
 #include "intake/MetricGroupV2.h"
 #include "intake/MetricService.h"
 #include "intake/ZelkorWrapper.h"
 #include "messages/MessageTable.h"
 #include "messages/wire/WireWriter.h"
 #include "screens/dashboard/DashboardViewController.h"
+#include "screens/metricdetail/MetricDetailViewModel.h"
 #include "screens/metriclist/AllMetricsViewController.h"
 #include "store/PersistanceStore.h"
+#include "support/MetricEvent.h"
+#include "support/TemporaryDirectory.h"
 
 namespace quorl {
 namespace {
@@ -66,8 +73,8 @@ struct Month {
 
 Month month() {
   if (const char* file = std::getenv("QUORL_BENCH_FILE"); file != nullptr) return {file, file, SystemClock().now()};
-  const std::size_t rows = bench::rowCount(100'000);
-  return {bench::monthOfRows(bench::directories({"."}).front(), rows, kStart), fmt::format("{} rows", rows), kStart};
+  const std::size_t rows = bench::rowCount();
+  return {bench::monthOfRows(bench::directory(), rows, kStart), fmt::format("{} rows", rows), kStart};
 }
 
 /// A queue that keeps for how long one of its tasks held it at most.
@@ -113,21 +120,20 @@ struct Source {
   const MessageTable* table;
   std::uint32_t timestampTag;
 
-  ByteString payload(Date time) const {
+  /// The metric as it is delivered at `time`.
+  zelkor::KeyValueMessage event(Date time) const {
     WireWriter writer;
     std::size_t count = 0;
     for (const FieldEntry& field : table->fields) {
       if (field.tag == timestampTag) {
-        writer.writeUInt64(static_cast<std::uint64_t>(
-                               std::chrono::duration_cast<std::chrono::milliseconds>(time.time_since_epoch()).count()),
-                           field.tag);
+        writer.writeUInt64(simulator::millisecondsSince1970(time), field.tag);
       } else if (field.key == "subs_id") {
         writer.writeUInt32(0, field.tag);
       } else if (field.kind < FieldKind::Bytes && field.kind != FieldKind::SInt32 && count++ < kFieldsOfMetric) {
         writer.writeUInt32(static_cast<std::uint32_t>(count % 2), field.tag);
       }
     }
-    return ByteString(writer.bytes());
+    return test::metricEvent(row->zelkorId, ByteString(writer.bytes()));
   }
 };
 
@@ -157,7 +163,7 @@ std::vector<Source> sources() {
 
 /// The product on real threads, with a copy of the month of rows.
 struct Site {
-  explicit Site(const Month& month) : clock(month.end), directory(bench::directories({"."}).front()) {
+  explicit Site(const Month& month) : clock(month.end), directory(bench::directory()) {
     std::filesystem::copy(month.file, directory.path() / "metricPartV11.sqlite");
     fake.documents.directory = directory.path();
     fake.properties.texts["BasebandChipset"] = "mav";
@@ -168,7 +174,7 @@ struct Site {
   test::ScopedTimeZone zone{"UTC"};
   RunningClock clock;
   test::VirtualTimeVfs vfs{clock};
-  bench::Directory directory;
+  test::TemporaryDirectory directory;
   test::FakePlatform fake;
   TimedQueues queues;
   std::shared_ptr<LoopQueue> loop = std::make_shared<LoopQueue>("main");
@@ -213,7 +219,7 @@ class Part {
     site_.main.longest();
     site_.queues.database->longest();
     const double processor = processorSeconds();
-    const std::size_t memory = bench::memory("VmRSS:");
+    const std::size_t memory = bench::memory();
     begun_ = Steady::now();
     site_.loop->async([&] { deliver(); });
     site_.loop->run();
@@ -230,8 +236,8 @@ class Part {
         "queue {:.2f} ms\n",
         delivered_, taken_.size(), pending_.size(), at(0.5), at(0.99), at(1),
         (processorSeconds() - processor) * 1e5 / elapsed.count(),
-        (static_cast<double>(bench::memory("VmRSS:")) - static_cast<double>(memory)) / 1e6,
-        site_.main.longest().count(), site_.queues.database->longest().count());
+        (static_cast<double>(bench::memory()) - static_cast<double>(memory)) / 1e6, site_.main.longest().count(),
+        site_.queues.database->longest().count());
     std::fflush(stdout);
   }
 
@@ -245,11 +251,9 @@ class Part {
   void deliver() {
     const Source& source = metrics_[delivered_ % metrics_.size()];
     const Date now = site_.clock.now();
-    zelkor::KeyValueMessage event;
-    event.set(zelkor::kKeyMetricID, source.row->zelkorId);
-    event.set(zelkor::kKeyPayload, source.payload(now));
+    zelkor::KeyValueMessage event = source.event(now);
     if (shown_(source)) pending_.push_back({&source, std::chrono::floor<std::chrono::seconds>(now), Steady::now()});
-    site_.fake.zelkor.deliver(zelkor::kEventMetric, event);
+    site_.fake.zelkor.deliver(zelkor::kEventMetric, std::move(event));
     if (++delivered_ < count_) {
       const auto due = begun_ + kInterval * static_cast<std::int64_t>(delivered_);
       site_.loop->asyncAfter(std::max<Steady::duration>(due - Steady::now(), 0s), [this] { deliver(); });
@@ -273,11 +277,39 @@ class Part {
   std::vector<Milliseconds> taken_;
 };
 
-/// Runs the main thread until the database has done what was asked of it so far.
-void settle(Site& site, int rounds) {
+/// Stops the main loop when so many reads, each begun when the one before has answered, are through; by then the
+/// database has done what was asked of it before. On the main queue.
+void stopAfterReads(Site& site, int rounds) {
   if (rounds == 0) return site.loop->stop();
-  site.store->fetchDashboard(0,
-                             [&, rounds](const auto& /*items*/, const auto& /*error*/) { settle(site, rounds - 1); });
+  site.store->fetchDashboard(
+      0, [&, rounds](const auto& /*items*/, const auto& /*error*/) { stopAfterReads(site, rounds - 1); });
+}
+
+void showList(Site& site, const std::vector<Source>& metrics, std::size_t seconds, AllMetricsViewController& list) {
+  fmt::print("list on the screen, {} s\n", seconds);
+  Part part(site, metrics, seconds * kMetricsPerSecond, [&](const Source& source) -> std::optional<Date> {
+    for (const AllMetricsDataSource& group : list.table())
+      for (const AllMetricsRowItem& item : group.rowItems)
+        if (item.metricName == source.row->name && group.metricTech == source.row->tech) return item.timeStamp;
+    return std::nullopt;
+  });
+  const Connection connection = list.onChange([&] { part.screenDidChange(); });
+  part.run();
+}
+
+void showDetail(Site& site, const std::vector<Source>& metrics, std::size_t seconds) {
+  fmt::print("detail of one metric on the screen, {} s\n", seconds);
+  const MetricGroupV2& metric = *metrics.front().row;
+  const auto detail =
+      MetricDetailViewModel::make(site.store, std::string(metric.tech), std::string(metric.name), 0, site.clock.now());
+  site.loop->async([&] { stopAfterReads(site, 4); });
+  site.loop->run();
+  Part part(site, metrics, seconds * kMetricsPerSecond, [&](const Source& source) -> std::optional<Date> {
+    if (source.row != &metric || detail->metrics().empty()) return std::nullopt;
+    return detail->metrics().front().collectedOn;
+  });
+  const Connection connection = detail->onChange([&] { part.screenDidChange(); });
+  part.run();
 }
 
 [[noreturn]] void run() {
@@ -285,51 +317,23 @@ void settle(Site& site, int rounds) {
   const Month rows = month();
   Site site(rows);
   const std::vector<Source> metrics = sources();
-  const std::size_t count = seconds * kMetricsPerSecond;
 
   const auto begun = Steady::now();
   const auto dashboard = DashboardViewController::make(site.store);
   const auto list = AllMetricsViewController::make(site.store);
-  site.loop->async([&] { settle(site, 4); });
+  site.loop->async([&] { stopAfterReads(site, 4); });
   site.loop->run();
   // Each metric once, so that it stands on the list; then two reads, from which on nothing is read for the first time.
-  for (const Source& source : metrics) {
-    zelkor::KeyValueMessage event;
-    event.set(zelkor::kKeyMetricID, source.row->zelkorId);
-    event.set(zelkor::kKeyPayload, source.payload(site.clock.now()));
-    site.fake.zelkor.deliver(zelkor::kEventMetric, event);
-  }
-  site.loop->asyncAfter(1s, [&] { settle(site, 4); });
+  for (const Source& source : metrics) site.fake.zelkor.deliver(zelkor::kEventMetric, source.event(site.clock.now()));
+  site.loop->asyncAfter(1s, [&] { stopAfterReads(site, 4); });
   site.loop->run();
   fmt::print("{}, {} metrics a second; {:.1f} s until the screens stand, 1 s of them waiting\n", rows.name,
              kMetricsPerSecond, Milliseconds(Steady::now() - begun).count() / 1e3);
   std::fflush(stdout);
 
-  {
-    fmt::print("list on the screen, {} s\n", seconds);
-    Part part(site, metrics, count, [&](const Source& source) -> std::optional<Date> {
-      for (const AllMetricsDataSource& group : list->table())
-        for (const AllMetricsRowItem& item : group.rowItems)
-          if (item.metricName == source.row->name && group.metricTech == source.row->tech) return item.timeStamp;
-      return std::nullopt;
-    });
-    const Connection connection = list->onChange([&] { part.screenDidChange(); });
-    part.run();
-  }
-  {
-    fmt::print("detail of one metric on the screen, {} s\n", seconds);
-    const auto detail = MetricDetailViewModel::make(site.store, std::string(metrics[0].row->tech),
-                                                    std::string(metrics[0].row->name), 0, site.clock.now());
-    site.loop->async([&] { settle(site, 4); });
-    site.loop->run();
-    Part part(site, metrics, count, [&](const Source& source) -> std::optional<Date> {
-      if (source.row != metrics[0].row || detail->metrics().empty()) return std::nullopt;
-      return detail->metrics().front().collectedOn;
-    });
-    const Connection connection = detail->onChange([&] { part.screenDidChange(); });
-    part.run();
-  }
-  fmt::print("most memory {:.1f} MB\n", static_cast<double>(bench::memory("VmHWM:")) / 1e6);
+  showList(site, metrics, seconds, *list);
+  showDetail(site, metrics, seconds);
+  fmt::print("most memory {:.1f} MB\n", static_cast<double>(bench::mostMemory()) / 1e6);
   std::fflush(stdout);
   // Like the product, the run ends without taking itself apart: reads may still wait.
   std::filesystem::remove_all(site.directory.path());

@@ -8,25 +8,30 @@
 
 #include <algorithm>
 #include <atomic>
+#include <chrono>
 #include <cmath>
+#include <cstddef>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <ctime>
+#include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <map>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
 
 #include <fmt/format.h>
 #include <malloc.h>
-#include <sqlite3.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "Memory.h"
 #include "NoStore.h"
 #include "StoreBench.h"
 #include "app/AppDelegate.h"
@@ -45,6 +50,8 @@
 #include "intake/ZelkorWrapper.h"
 #include "shell/BaseViewController.h"
 #include "shell/NotificationNames.h"
+#include "store/RawDatabase.h"
+#include "support/TemporaryDirectory.h"
 
 namespace quorl {
 namespace {
@@ -102,6 +109,13 @@ class WatchedQueue final : public Queue {
     double longestMs = 0;       // of one task, by the clock on the wall
     double longestOwnMs = 0;    // by the processor's time
     std::size_t longHolds = 0;  // tasks longer than the goal, by the processor's time
+
+    void add(const Seen& other) {
+      deepest = std::max(deepest, other.deepest);
+      longestMs = std::max(longestMs, other.longestMs);
+      longestOwnMs = std::max(longestOwnMs, other.longestOwnMs);
+      longHolds += other.longHolds;
+    }
   };
 
   WatchedQueue(std::shared_ptr<Queue> queue, std::shared_ptr<simulator::Activity> activity, SimulatedTime& time)
@@ -123,9 +137,7 @@ class WatchedQueue final : public Queue {
       {
         const std::lock_guard lock(watched->mutex);
         --watched->waiting;
-        watched->seen.longestMs = std::max(watched->seen.longestMs, ms);
-        watched->seen.longestOwnMs = std::max(watched->seen.longestOwnMs, ownMs);
-        if (ownMs > kLongestHoldMs) ++watched->seen.longHolds;
+        watched->seen.add({0, ms, ownMs, ownMs > kLongestHoldMs ? 1U : 0U});
       }
       activity->end();
     });
@@ -278,29 +290,66 @@ struct Site {
                     console, alerts,      analytics, share, pasteboard, baseband,  telephony};
 };
 
-std::string countOf(const std::filesystem::path& file, const char* sql) {
-  sqlite3* database = nullptr;
-  std::string answer;
-  sqlite3_open(file.c_str(), &database);
-  sqlite3_exec(
-      database, sql,
-      [](void* context, int /*columns*/, char** values, char** /*names*/) {
-        *static_cast<std::string*>(context) = values[0];
-        return 0;
-      },
-      &answer, nullptr);
-  sqlite3_close(database);
-  return answer;
-}
-
-double megabytes(std::string_view field) {
-  return static_cast<double>(bench::memory(field)) / 1e6;
+double megabytes(std::size_t bytes) {
+  return static_cast<double>(bytes) / 1e6;
 }
 
 /// What the process has asked for and not given back, of what the allocator holds for it, in megabytes.
 double inUse() {
   const struct mallinfo2 heap = mallinfo2();
-  return static_cast<double>(heap.uordblks + heap.hblkhd) / 1e6;
+  return megabytes(heap.uordblks + heap.hblkhd);
+}
+
+/// How the run went along.
+struct Pace {
+  double seconds = 0;  // of the whole run, by the clock on the wall
+  double longestSecondMs = 0;
+  std::size_t slowSeconds = 0;  // simulated seconds that took longer than one
+  WatchedQueue::Seen main;
+  std::size_t mostMemory = 0;  // in bytes, looked at once a simulated minute
+};
+
+/// Lets the simulated time pass second by second, and prints a line for each hour.
+Pace drive(Site& site, LiveScenario& live, milliseconds length, const std::size_t& announced) {
+  fmt::print("{:>7} {:>9} {:>10} {:>8} {:>9} {:>12} {:>12} {:>22} {:>10}\n", "hour", "events", "rows", "RSS MB",
+             "in use MB", "main deepest", "db deepest", "main hold ms (cpu)", "> 100 ms");
+  Pace pace;
+  const auto begun = Steady::now();
+  const milliseconds section = std::min<milliseconds>(length, 1h);
+  for (milliseconds passed{0}; passed < length;) {
+    const auto secondBegun = Steady::now();
+    live.advance(1s);
+    site.settle();
+    site.time.pass(1s);
+    site.settle();
+    const double secondMs = std::chrono::duration<double, std::milli>(Steady::now() - secondBegun).count();
+    pace.longestSecondMs = std::max(pace.longestSecondMs, secondMs);
+    if (secondMs > 1000) ++pace.slowSeconds;
+    passed += 1s;
+    if (passed % 1min == 0s) pace.mostMemory = std::max(pace.mostMemory, bench::memory());
+    if (passed % section != 0s && passed < length) continue;
+    const auto main = site.main.look();
+    const auto database = site.queues.database().look();
+    pace.main.add(main);
+    fmt::print("{:>7.2f} {:>9} {:>10} {:>8.1f} {:>9.1f} {:>12} {:>12} {:>13.1f} ({:>6.1f}) {:>10}\n",
+               static_cast<double>(passed.count()) / 3.6e6, live.events(), announced, megabytes(bench::memory()),
+               inUse(), main.deepest, database.deepest, main.longestMs, main.longestOwnMs, main.longHolds);
+    std::fflush(stdout);
+  }
+  pace.seconds = std::chrono::duration<double>(Steady::now() - begun).count();
+  return pace;
+}
+
+void print(const Pace& pace, milliseconds length) {
+  fmt::print("{:.0f} s, {:.0f} times as fast as life; longest second {:.0f} ms, {} seconds took more than one\n",
+             pace.seconds, static_cast<double>(length.count()) / 1e3 / pace.seconds, pace.longestSecondMs,
+             pace.slowSeconds);
+  fmt::print(
+      "main thread held for {:.1f} ms at most ({:.1f} ms of the processor), {} times for more than {:.0f} ms of "
+      "the processor\n",
+      pace.main.longestMs, pace.main.longestOwnMs, pace.main.longHolds, kLongestHoldMs);
+  fmt::print("RSS {:.1f} MB at most by the minute, {:.1f} MB at any time\n", megabytes(pace.mostMemory),
+             megabytes(bench::mostMemory()));
 }
 
 [[noreturn]] void run(const std::string& name, milliseconds length) {
@@ -313,7 +362,7 @@ double inUse() {
   const ScenarioChoice choice{*std::move(scenario), 1, simulator::metrics::Family::Mav};
   Expectation expectation(choice, start, length);
 
-  const bench::Directory directory(bench::directories({"."}).front());
+  const test::TemporaryDirectory directory(bench::directory());
   Site site(start, directory.path());
   const auto log = std::make_shared<FailureLog>();
   installLogSink(log);
@@ -333,52 +382,15 @@ double inUse() {
   site.settle();
 
   fmt::print("{}, {} simulated minutes\n", name, length.count() / 60000);
-  fmt::print("{:>7} {:>9} {:>10} {:>8} {:>9} {:>12} {:>12} {:>22} {:>10}\n", "hour", "events", "rows", "RSS MB",
-             "in use MB", "main deepest", "db deepest", "main hold ms (cpu)", "> 100 ms");
-  const auto begun = Steady::now();
-  const milliseconds section = std::min<milliseconds>(length, 1h);
-  double longestSecondMs = 0;
-  std::size_t slowSeconds = 0;
-  std::size_t longHolds = 0;
-  double longestMs = 0;
-  double longestOwnMs = 0;
-  double mostRss = 0;
-  for (milliseconds passed{0}; passed < length;) {
-    const auto secondBegun = Steady::now();
-    (*live)->advance(1s);
-    site.settle();
-    site.time.pass(1s);
-    site.settle();
-    const double secondMs = std::chrono::duration<double, std::milli>(Steady::now() - secondBegun).count();
-    longestSecondMs = std::max(longestSecondMs, secondMs);
-    if (secondMs > 1000) ++slowSeconds;
-    passed += 1s;
-    if (passed % 1min == 0s) mostRss = std::max(mostRss, megabytes("VmRSS:"));
-    if (passed % section != 0s && passed < length) continue;
-    const auto main = site.main.look();
-    const auto database = site.queues.database().look();
-    longHolds += main.longHolds;
-    longestMs = std::max(longestMs, main.longestMs);
-    longestOwnMs = std::max(longestOwnMs, main.longestOwnMs);
-    fmt::print("{:>7.2f} {:>9} {:>10} {:>8.1f} {:>9.1f} {:>12} {:>12} {:>13.1f} ({:>6.1f}) {:>10}\n",
-               static_cast<double>(passed.count()) / 3.6e6, (*live)->events(), announced, megabytes("VmRSS:"), inUse(),
-               main.deepest, database.deepest, main.longestMs, main.longestOwnMs, main.longHolds);
-    std::fflush(stdout);
-  }
-  const double seconds = std::chrono::duration<double>(Steady::now() - begun).count();
+  const Pace pace = drive(site, **live, length, announced);
   ApplicationLoop(*application).terminate();
   site.settle();
 
   const Expected expected = expectation.wait();
-  const std::string stored =
-      countOf(directory.path() / "metricPartV11.sqlite", "SELECT count(*) FROM Metric WHERE metric_tech != 'RAT'");
-  fmt::print("{:.0f} s, {:.0f} times as fast as life; longest second {:.0f} ms, {} seconds took more than one\n",
-             seconds, static_cast<double>(length.count()) / 1e3 / seconds, longestSecondMs, slowSeconds);
-  fmt::print(
-      "main thread held for {:.1f} ms at most ({:.1f} ms of the processor), {} times for more than {:.0f} ms of "
-      "the processor\n",
-      longestMs, longestOwnMs, longHolds, kLongestHoldMs);
-  fmt::print("RSS {:.1f} MB at most by the minute, {:.1f} MB at any time\n", mostRss, megabytes("VmHWM:"));
+  const std::string stored = test::RawDatabase(directory.path() / "metricPartV11.sqlite")
+                                 .column("SELECT count(*) FROM Metric WHERE metric_tech != 'RAT'")
+                                 .at(0);
+  print(pace, length);
   const bool isWhole = expected.events == (*live)->events() && expected.rows == announced &&
                        std::to_string(announced) == stored && log->failures == expected.impossibleRows;
   fmt::print(

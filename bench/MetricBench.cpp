@@ -2,26 +2,26 @@
 // beside a bare loop that inserts as many rows with the same statement, in the same run. On /dev/shm, so that the disk
 // does not hide what the product adds. At the end the ratio of the medians is printed.
 
+#include <cstdint>
 #include <cstdlib>
-#include <filesystem>
 #include <memory>
-#include <string>
 
 #include <benchmark/benchmark.h>
 #include <fmt/format.h>
 #include <sqlite3.h>
 
+#include "Medians.h"
 #include "StoreBench.h"
 #include "app/HardwareManager.h"
 #include "base/NotificationCenter.h"
-#include "base/SerialQueue.h"
 #include "intake/ZelkorWrapper.h"
 #include "messages/classes/nas_context.h"
 #include "messages/wire/WireWriter.h"
 #include "shell/NotificationNames.h"
 #include "store/MetricStatements.h"
 #include "store/PersistanceStore.h"
-#include "support/FakePlatform.h"
+#include "support/MetricEvent.h"
+#include "support/TemporaryDirectory.h"
 
 namespace quorl {
 namespace {
@@ -29,28 +29,16 @@ namespace {
 constexpr std::int64_t kNasMetricId = 3986700;
 constexpr int kRepetitions = 21;
 
-/// An Ice phone with real queues whose main queue is the bench's thread.
-struct Phone {
-  Phone() {
-    fake.properties.texts["BasebandChipset"] = "ice";
-    directory = std::filesystem::path("/dev/shm") / ("quorl-bench-" + Uuid::make().string());
-    std::filesystem::create_directory(directory);
-    fake.documents.directory = directory;
-    Platform::install(&platform);
+/// The store of an Ice phone.
+struct Site {
+  Site() {
+    phone.fake.properties.texts["BasebandChipset"] = "ice";
+    phone.fake.documents.directory = directory.path();
     store = std::make_unique<PersistanceStore>(HardwareManager::shared(), ZelkorWrapper::sharedInstance());
   }
-  ~Phone() {
-    store.reset();
-    std::filesystem::remove_all(directory);
-  }
 
-  test::FakePlatform fake;
-  ThreadQueueFactory queues;
-  LoopQueue main{"main"};
-  Platform platform{main,           main,           queues,          fake.time,    fake.properties,
-                    fake.resources, fake.documents, fake.strings,    fake.console, fake.alerts,
-                    fake.analytics, fake.share,     fake.pasteboard, fake.zelkor,  fake.silentTelephony};
-  std::filesystem::path directory;
+  bench::Phone phone;
+  const test::TemporaryDirectory directory{"/dev/shm"};
   std::unique_ptr<PersistanceStore> store;
 };
 
@@ -72,10 +60,8 @@ ByteString nasPayload() {
 
 constexpr int kRowsOfMetric = 9;
 
-void endToEnd(benchmark::State& state, Phone& phone) {
-  zelkor::KeyValueMessage event;
-  event.set(zelkor::kKeyMetricID, kNasMetricId);
-  event.set(zelkor::kKeyPayload, nasPayload());
+void endToEnd(benchmark::State& state, bench::Phone& phone) {
+  const zelkor::KeyValueMessage event = test::metricEvent(kNasMetricId, nasPayload());
   int left = 0;
   const auto observation =
       NotificationCenter::defaultCenter().observe(notification::kNewZelkorMetric, [&](const auto&) {
@@ -88,16 +74,12 @@ void endToEnd(benchmark::State& state, Phone& phone) {
   }
 }
 
-void bareLoop(benchmark::State& state, Phone& phone) {
-  sqlite3* const database = phone.store->database().dbPointer();
+void bareLoop(benchmark::State& state, sqlite3* database) {
   for ([[maybe_unused]] auto _ : state) {
     for (int i = 0; i < kRowsOfMetric; ++i) {
       sqlite3_stmt* statement = nullptr;
       sqlite3_prepare_v2(database, SQLTable<Metric>::insertMetric, -1, &statement, nullptr);
-      for (const int index : {1, 2, 3, 4, 5, 7}) sqlite3_bind_text(statement, index, "is_ims_voice", -1, SQLITE_STATIC);
-      sqlite3_bind_int(statement, 6, 0);
-      sqlite3_bind_int(statement, 8, 0);
-      sqlite3_bind_text(statement, 9, "2026-01-05 09:30:12", -1, SQLITE_STATIC);
+      bench::bindShortRow(statement);
       if (sqlite3_step(statement) != SQLITE_DONE) std::abort();
       sqlite3_finalize(statement);
     }
@@ -109,7 +91,7 @@ void bareLoop(benchmark::State& state, Phone& phone) {
 
 int main(int argc, char** argv) {
   benchmark::Initialize(&argc, argv);
-  quorl::Phone phone;
+  quorl::Site site;
   const auto add = [](const char* name, auto body) {
     benchmark::RegisterBenchmark(name, body)
         ->Unit(benchmark::kMicrosecond)
@@ -118,9 +100,9 @@ int main(int argc, char** argv) {
         ->Repetitions(quorl::kRepetitions)
         ->ReportAggregatesOnly();
   };
-  add("metric/store", [&](benchmark::State& state) { quorl::endToEnd(state, phone); });
-  add("metric/bare", [&](benchmark::State& state) { quorl::bareLoop(state, phone); });
-  quorl::bench::MedianReporter reporter;
+  add("metric/store", [&](benchmark::State& state) { quorl::endToEnd(state, site.phone); });
+  add("metric/bare", [&](benchmark::State& state) { quorl::bareLoop(state, site.store->database().dbPointer()); });
+  quorl::bench::MedianReporter reporter("store", "bare");
   benchmark::RunSpecifiedBenchmarks(&reporter);
   if (const auto ratio = reporter.ratio("metric"))
     fmt::print("\nratio of medians, one metric end to end to a bare loop over its rows\n  {:.2f}\n", ratio->real);

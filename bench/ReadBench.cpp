@@ -4,18 +4,20 @@
 // takes. QUORL_BENCH_ROWS is the number of rows, QUORL_BENCH_DIR the directory of the file, which is made once and
 // kept; without them, a hundred thousand and the working directory.
 
+#include <cstddef>
 #include <cstdlib>
 #include <functional>
+#include <memory>
 #include <optional>
 #include <string>
-#include <string_view>
 #include <utility>
 #include <vector>
 
 #include <benchmark/benchmark.h>
 #include <fmt/format.h>
-#include <sqlite3.h>
 
+#include "Medians.h"
+#include "Memory.h"
 #include "StoreBench.h"
 #include "store/MetricStatements.h"
 
@@ -23,23 +25,8 @@ namespace quorl {
 namespace {
 
 constexpr int kRepetitions = 7;
-constexpr std::size_t kUsualRows = 100'000;
 
 using Done = std::function<void()>;
-
-/// Steps a statement to its end and takes its columns: 'i' an integer, 't' a text, '-' none.
-void stepBare(sqlite3* database, const std::string& sql, std::string_view columns) {
-  sqlite3_stmt* statement = nullptr;
-  if (sqlite3_prepare_v2(database, sql.c_str(), -1, &statement, nullptr) != SQLITE_OK) std::abort();
-  while (sqlite3_step(statement) == SQLITE_ROW) {
-    for (std::size_t i = 0; i < columns.size(); ++i) {
-      const int column = static_cast<int>(i);
-      if (columns[i] == 'i') benchmark::DoNotOptimize(sqlite3_column_int(statement, column));
-      if (columns[i] == 't') benchmark::DoNotOptimize(sqlite3_column_text(statement, column));
-    }
-  }
-  sqlite3_finalize(statement);
-}
 
 class ReadBench {
  public:
@@ -57,7 +44,7 @@ class ReadBench {
       for ([[maybe_unused]] auto _ : state) {
         untilDone([&](Done done) {
           database_->queue().async([&, done = std::move(done)] {
-            stepBare(database_->dbPointer(), sql, columns);
+            bench::stepBare(database_->dbPointer(), sql, columns);
             phone_.main.async(done);
           });
         });
@@ -92,8 +79,7 @@ int main(int argc, char** argv) {
   using Table = SQLTable<Metric>;
   if (!bench::initialize(argc, argv)) return 1;
   bench::Phone phone;
-  const auto path =
-      bench::monthOfRows(bench::directories({"."}).front(), bench::rowCount(kUsualRows), phone.fake.time.now());
+  const auto path = bench::monthOfRows(bench::directory(), bench::rowCount(), phone.fake.time.now());
   const std::shared_ptr<SQLiteDatabase> database = SQLiteDatabase::open(path.string()).value();
   ReadBench reads(phone, database);
 
@@ -128,7 +114,7 @@ int main(int argc, char** argv) {
               });
   }
 
-  bench::MedianReporter reporter;
+  bench::MedianReporter reporter("store", "bare");
   benchmark::RunSpecifiedBenchmarks(&reporter);
   fmt::print("\n{:<26}{:>14}{:>14}{:>10}{:>12}\n", "medians", "store, ms", "bare, ms", "ratio", "of CPU");
   for (const std::string& task : reads.tasks()) {
@@ -139,7 +125,7 @@ int main(int argc, char** argv) {
   }
 
   bench::resetMostMemory();
-  const std::size_t before = bench::memory("VmRSS:");
+  const std::size_t before = bench::memory();
   std::size_t rows = 0;
   reads.untilDone([&](Done done) {
     database->exportMetrics(AttributeDetailTimeFrame::monthly,
@@ -149,6 +135,6 @@ int main(int argc, char** argv) {
                             });
   });
   fmt::print("\nmonthly export: {} rows, peak {:.0f} MB above the {:.0f} MB before\n", rows,
-             static_cast<double>(bench::memory("VmHWM:") - before) / 1e6, static_cast<double>(before) / 1e6);
+             static_cast<double>(bench::mostMemory() - before) / 1e6, static_cast<double>(before) / 1e6);
   return 0;
 }

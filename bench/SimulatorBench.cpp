@@ -7,6 +7,8 @@
 #include <filesystem>
 #include <map>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include <benchmark/benchmark.h>
@@ -14,7 +16,9 @@
 #include <sqlite3.h>
 
 #include "NoStore.h"
-#include "base/Uuid.h"
+#include "StoreBench.h"
+#include "base/Clock.h"
+#include "hosts/simulator/EpochTime.h"
 #include "hosts/simulator/ScenarioFiles.h"
 #include "hosts/simulator/ScenarioRun.h"
 #include "hosts/simulator/history/BulkIntake.h"
@@ -22,11 +26,13 @@
 #include "intake/ZelkorWrapper.h"
 #include "store/MetricStatements.h"
 #include "support/FakePlatform.h"
+#include "support/TemporaryDirectory.h"
 
 namespace quorl::simulator {
 namespace {
 
 constexpr std::chrono::minutes kWay{10};
+constexpr Date kStart{std::chrono::seconds(1767605400)};  // 2026-01-05 09:30:00 UTC
 
 ScenarioChoice way(std::string_view name, metrics::Family family) {
   return {findScenario(name, {QUORL_SOURCE_DIR "/resources"}).value(), 1, family};
@@ -34,7 +40,7 @@ ScenarioChoice way(std::string_view name, metrics::Family family) {
 
 std::vector<RecordedEvent> eventsOf(const ScenarioChoice& choice) {
   std::vector<RecordedEvent> events;
-  ScenarioRun run(choice, 1767605400000);
+  ScenarioRun run(choice, millisecondsSince1970(kStart));
   run.advance(kWay, [&events](RecordedEvent event) { events.push_back(std::move(event)); });
   return events;
 }
@@ -46,7 +52,7 @@ std::string rateName(std::string_view what) {
 void simulated(benchmark::State& state, const ScenarioChoice& choice) {
   std::uint64_t metrics = 0;
   for ([[maybe_unused]] auto _ : state) {
-    ScenarioRun run(choice, 1767605400000);
+    ScenarioRun run(choice, millisecondsSince1970(kStart));
     run.advance(kWay, [&metrics](const RecordedEvent& event) {
       benchmark::DoNotOptimize(event);
       ++metrics;
@@ -67,23 +73,12 @@ void taken(benchmark::State& state, const ScenarioChoice& choice) {
   state.counters[rateName("metrics")] = benchmark::Counter(static_cast<double>(metrics), benchmark::Counter::kIsRate);
 }
 
-class Folder {
- public:
-  Folder() { std::filesystem::create_directory(path_); }
-  ~Folder() { std::filesystem::remove_all(path_); }
-  std::filesystem::path file(const std::string& name) const { return path_ / name; }
-
- private:
-  const std::filesystem::path path_ = std::filesystem::path("/dev/shm") / ("quorl-bench-" + Uuid::make().string());
-};
-
 void history(benchmark::State& state, const ScenarioChoice& choice) {
-  const Folder folder;
-  const Date until(std::chrono::seconds(1767605400));
+  const test::TemporaryDirectory folder{"/dev/shm"};
   std::uint64_t rows = 0;
   for ([[maybe_unused]] auto _ : state) {
-    const auto file = folder.file("history");
-    const auto made = writeHistory(file, {choice, 1, until}, {});
+    const auto file = folder.path() / "history";
+    const auto made = writeHistory(file, {choice, 1, kStart}, {});
     rows += made ? made->rows : 0;
     std::filesystem::remove(file);
   }
@@ -92,27 +87,25 @@ void history(benchmark::State& state, const ScenarioChoice& choice) {
 
 void bareLoop(benchmark::State& state) {
   constexpr int kRows = 100000;
-  const Folder folder;
+  const test::TemporaryDirectory folder{"/dev/shm"};
+  const auto file = folder.path() / "bare";
   for ([[maybe_unused]] auto _ : state) {
     sqlite3* database = nullptr;
-    sqlite3_open(folder.file("bare").c_str(), &database);
-    sqlite3_exec(database, "PRAGMA journal_mode=WAL", nullptr, nullptr, nullptr);
-    sqlite3_exec(database, SQLTable<Metric>::createMetricTable, nullptr, nullptr, nullptr);
+    sqlite3_open(file.c_str(), &database);
+    bench::execute(database, "PRAGMA journal_mode=WAL");
+    bench::execute(database, SQLTable<Metric>::createMetricTable);
     sqlite3_stmt* statement = nullptr;
     sqlite3_prepare_v2(database, SQLTable<Metric>::insertMetric, -1, &statement, nullptr);
-    sqlite3_exec(database, "BEGIN", nullptr, nullptr, nullptr);
+    bench::execute(database, "BEGIN");
     for (int row = 0; row < kRows; ++row) {
-      for (const int index : {1, 2, 3, 4, 5, 7}) sqlite3_bind_text(statement, index, "is_ims_voice", -1, SQLITE_STATIC);
-      sqlite3_bind_int(statement, 6, 0);
-      sqlite3_bind_int(statement, 8, 0);
-      sqlite3_bind_text(statement, 9, "2026-01-05 09:30:12", -1, SQLITE_STATIC);
+      bench::bindShortRow(statement);
       sqlite3_step(statement);
       sqlite3_reset(statement);
     }
-    sqlite3_exec(database, "COMMIT", nullptr, nullptr, nullptr);
+    bench::execute(database, "COMMIT");
     sqlite3_finalize(statement);
     sqlite3_close(database);
-    std::filesystem::remove(folder.file("bare"));
+    std::filesystem::remove(file);
   }
   state.counters[rateName("rows")] =
       benchmark::Counter(static_cast<double>(state.iterations()) * kRows, benchmark::Counter::kIsRate);

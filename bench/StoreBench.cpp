@@ -3,26 +3,20 @@
 #include <array>
 #include <chrono>
 #include <cstdlib>
-#include <fstream>
+#include <memory>
 #include <utility>
 
 #include <fmt/format.h>
-#include <malloc.h>
-#include <sqlite3.h>
-#include <stdlib.h>
 
 #include "base/DateText.h"
 #include "store/DefaultDashboard.h"
 #include "store/MetricStatements.h"
+#include "support/TemporaryDirectory.h"
 
 namespace quorl::bench {
 namespace {
 
 constexpr std::size_t kDays = 30;
-
-void run(sqlite3* database, const std::string& sql) {
-  if (sqlite3_exec(database, sql.c_str(), nullptr, nullptr, nullptr) != SQLITE_OK) std::abort();
-}
 
 /// Binds one row after the other to the parameters of the insert.
 class Readings {
@@ -61,13 +55,13 @@ class Readings {
 void fill(const std::filesystem::path& path, std::size_t rows, Date end) {
   const std::shared_ptr<SQLiteDatabase> database = SQLiteDatabase::open(path.string()).value();
   sqlite3* const connection = database->dbPointer();
-  run(connection, "PRAGMA synchronous=OFF");
-  run(connection, SQLTable<Metric>::createMetricTable);
-  run(connection, SQLTable<Metric>::createDashboardTable);
-  run(connection, "BEGIN");
+  execute(connection, "PRAGMA synchronous=OFF");
+  execute(connection, SQLTable<Metric>::createMetricTable);
+  execute(connection, SQLTable<Metric>::createDashboardTable);
+  execute(connection, "BEGIN");
   for (const Metric& pin : defaultDashboard(/*isMavDevice=*/true, end))
-    run(connection, SQLTable<Metric>::insertDashboardItem(
-                        {pin.metricTech, pin.metricId, pin.metricName, pin.attributeName, pin.subsId}));
+    execute(connection, SQLTable<Metric>::insertDashboardItem(
+                            {pin.metricTech, pin.metricId, pin.metricName, pin.attributeName, pin.subsId}));
   const auto span = std::chrono::duration_cast<Date::duration>(std::chrono::hours(24 * kDays - 1));
   sqlite3_stmt* statement = nullptr;
   sqlite3_prepare_v2(connection, SQLTable<Metric>::insertMetric, -1, &statement, nullptr);
@@ -82,25 +76,19 @@ void fill(const std::filesystem::path& path, std::size_t rows, Date end) {
     sqlite3_reset(statement);
   }
   sqlite3_finalize(statement);
-  run(connection, "COMMIT");
-  run(connection, "PRAGMA wal_checkpoint(TRUNCATE)");
+  execute(connection, "COMMIT");
+  execute(connection, "PRAGMA wal_checkpoint(TRUNCATE)");
 }
 
 }  // namespace
 
-Directory::Directory(const std::filesystem::path& directory) {
-  std::string name = (directory / "quorl-bench-XXXXXX").string();
-  if (mkdtemp(name.data()) == nullptr) std::abort();
-  path_ = name;
-}
-
-Directory::~Directory() {
-  std::filesystem::remove_all(path_);
-}
-
 std::vector<std::string> directories(std::vector<std::string> otherwise) {
   if (const char* directory = std::getenv("QUORL_BENCH_DIR")) return {directory};
   return otherwise;
+}
+
+std::filesystem::path directory() {
+  return directories({"."}).front();
 }
 
 std::size_t number(const char* name, std::size_t usual) {
@@ -108,8 +96,32 @@ std::size_t number(const char* name, std::size_t usual) {
   return text != nullptr ? std::strtoull(text, nullptr, 10) : usual;
 }
 
-std::size_t rowCount(std::size_t usual) {
-  return number("QUORL_BENCH_ROWS", usual);
+std::size_t rowCount() {
+  return number("QUORL_BENCH_ROWS", 100'000);
+}
+
+void execute(sqlite3* database, const std::string& sql) {
+  if (sqlite3_exec(database, sql.c_str(), nullptr, nullptr, nullptr) != SQLITE_OK) std::abort();
+}
+
+void stepBare(sqlite3* database, const std::string& sql, std::string_view columns) {
+  sqlite3_stmt* statement = nullptr;
+  if (sqlite3_prepare_v2(database, sql.c_str(), -1, &statement, nullptr) != SQLITE_OK) std::abort();
+  while (sqlite3_step(statement) == SQLITE_ROW) {
+    for (std::size_t i = 0; i < columns.size(); ++i) {
+      const int column = static_cast<int>(i);
+      if (columns[i] == 'i') benchmark::DoNotOptimize(sqlite3_column_int(statement, column));
+      if (columns[i] == 't') benchmark::DoNotOptimize(sqlite3_column_text(statement, column));
+    }
+  }
+  sqlite3_finalize(statement);
+}
+
+void bindShortRow(sqlite3_stmt* insert) {
+  for (const int index : {1, 2, 3, 4, 5, 7}) sqlite3_bind_text(insert, index, "is_ims_voice", -1, SQLITE_STATIC);
+  sqlite3_bind_int(insert, 6, 0);
+  sqlite3_bind_int(insert, 8, 0);
+  sqlite3_bind_text(insert, 9, "2026-01-05 09:30:12", -1, SQLITE_STATIC);
 }
 
 std::string metricTechOf(std::size_t metric) {
@@ -128,51 +140,11 @@ std::string attributeNameOf(std::size_t attribute) {
 std::filesystem::path monthOfRows(const std::filesystem::path& directory, std::size_t rows, Date now) {
   const std::filesystem::path path = directory / fmt::format("quorl-bench-month-{}.sqlite", rows);
   if (std::filesystem::exists(path)) return path;
-  const Directory scratch(directory);  // a run that is cut short leaves no half of a file
+  const test::TemporaryDirectory scratch(directory);  // a run that is cut short leaves no half of a file
   const std::filesystem::path unfinished = scratch.path() / "file.sqlite";
   fill(unfinished, rows, now);
   std::filesystem::rename(unfinished, path);
   return path;
-}
-
-std::size_t memory(std::string_view field) {
-  std::ifstream status("/proc/self/status");
-  for (std::string line; std::getline(status, line);)
-    if (line.starts_with(field)) return std::strtoull(line.c_str() + field.size(), nullptr, 10) * 1024;
-  return 0;
-}
-
-void resetMostMemory() {
-  malloc_trim(0);
-  std::ofstream("/proc/self/clear_refs") << 5;
-}
-
-void MedianReporter::ReportRuns(const std::vector<Run>& runs) {
-  ConsoleReporter::ReportRuns(runs);
-  for (const Run& run : runs)
-    if (run.aggregate_name == "median")
-      medians_[run.run_name.function_name] = {run.GetAdjustedRealTime(), run.GetAdjustedCPUTime()};
-}
-
-std::optional<MedianReporter::Times> MedianReporter::times(const std::string& task, const std::string& side) const {
-  const auto found = medians_.find(task + "/" + side);
-  return found == medians_.end() ? std::nullopt : std::optional(found->second);
-}
-
-std::optional<MedianReporter::Times> MedianReporter::ratio(const std::string& task) const {
-  const auto store = times(task, "store");
-  const auto bare = times(task, "bare");
-  if (!store || !bare) return std::nullopt;
-  return Times{store->real / bare->real, store->processor / bare->processor};
-}
-
-bool initialize(int argc, char** argv) {
-  std::vector<char*> arguments(argv, argv + argc);
-  std::string interleave = "--benchmark_enable_random_interleaving=true";
-  arguments.insert(arguments.begin() + 1, interleave.data());
-  int count = static_cast<int>(arguments.size());
-  benchmark::Initialize(&count, arguments.data());
-  return !benchmark::ReportUnrecognizedArguments(count, arguments.data());
 }
 
 }  // namespace quorl::bench

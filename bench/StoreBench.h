@@ -2,14 +2,12 @@
 
 #include <cstddef>
 #include <filesystem>
-#include <map>
-#include <memory>
-#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include <benchmark/benchmark.h>
+#include <sqlite3.h>
 
 #include "base/SerialQueue.h"
 #include "store/DBManager.h"
@@ -41,27 +39,23 @@ struct Phone {
                     fake.analytics, fake.share,     fake.pasteboard, fake.zelkor, fake.silentTelephony};
 };
 
-/// A directory of its own below `directory`, removed with all that is in it when this goes away.
-class Directory {
- public:
-  explicit Directory(const std::filesystem::path& directory);
-  ~Directory();
-  Directory(const Directory&) = delete;
-  Directory& operator=(const Directory&) = delete;
-
-  const std::filesystem::path& path() const { return path_; }
-
- private:
-  std::filesystem::path path_;
-};
-
 /// Where files go: QUORL_BENCH_DIR, or `otherwise`.
 std::vector<std::string> directories(std::vector<std::string> otherwise);
+/// QUORL_BENCH_DIR, or the working directory.
+std::filesystem::path directory();
 
 /// The number in the environment variable `name`, or `usual`.
 std::size_t number(const char* name, std::size_t usual);
-/// QUORL_BENCH_ROWS, or `usual`.
-std::size_t rowCount(std::size_t usual);
+/// QUORL_BENCH_ROWS, or a hundred thousand.
+std::size_t rowCount();
+
+/// Runs statements whose rows do not matter.
+void execute(sqlite3* database, const std::string& sql);
+/// Steps a statement to its end and takes its columns: 'i' an integer, 't' a text, '-' none. Columns behind the named
+/// ones are not taken.
+void stepBare(sqlite3* database, const std::string& sql, std::string_view columns);
+/// Binds one and the same row of short values to the store's statement of an insert.
+void bindShortRow(sqlite3_stmt* insert);
 
 // A month of what a Mav device reports all day: messages of eight attributes, most values short numbers, some
 // enumerators, and in each message a time that no other has.
@@ -75,33 +69,6 @@ std::string attributeNameOf(std::size_t attribute);
 /// The file of `rows` such rows over the thirty days up to `now`, and of the default pins, in `directory`. It
 /// is made when it is not there, and stays for later runs.
 std::filesystem::path monthOfRows(const std::filesystem::path& directory, std::size_t rows, Date now);
-
-/// Memory of the process in bytes by its name in the system's status: "VmRSS:" now, "VmHWM:" the most since the reset.
-std::size_t memory(std::string_view field);
-void resetMostMemory();
-
-/// Keeps the medians of the repetitions, by name.
-class MedianReporter : public benchmark::ConsoleReporter {
- public:
-  /// Of one side of a task, in its unit: by the clock on the wall, and of the processor, of all threads.
-  struct Times {
-    double real = 0;
-    double processor = 0;
-  };
-
-  void ReportRuns(const std::vector<Run>& runs) override;
-  /// Of "<task>/store" and "<task>/bare"; nothing if it did not run.
-  std::optional<Times> times(const std::string& task, const std::string& side) const;
-  /// Of the store's medians to the bare ones; nothing if one of the two did not run.
-  std::optional<Times> ratio(const std::string& task) const;
-
- private:
-  std::map<std::string, Times> medians_;
-};
-
-/// False when the command line cannot be understood. Repetitions are interleaved, which spreads what else the machine
-/// does over both sides.
-bool initialize(int argc, char** argv);
 
 /// `body` once for each of many repetitions.
 template <typename Body>

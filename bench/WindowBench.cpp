@@ -3,7 +3,7 @@
 // product, or without rows.
 //
 //   bench_window                            start and frames, about half a minute
-//   bench_window --memory SECONDS SPEED     memory while the shipped recording is played, such as 360 10
+//   bench_window --memory SECONDS SPEED     memory on a way through the default scenario, such as 360 10
 
 #include <QEventLoop>
 #include <QGuiApplication>
@@ -12,18 +12,17 @@
 #include <QTimer>
 #include <algorithm>
 #include <chrono>
+#include <cstddef>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
-#include <fstream>
 #include <functional>
 #include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
 
-#include <unistd.h>
-
+#include "Memory.h"
 #include "app/AppDelegate.h"
 #include "app/ApplicationLoop.h"
 #include "base/NotificationCenter.h"
@@ -59,13 +58,8 @@ void untilFirstFrame(QQuickWindow& window) {
   loop.exec();
 }
 
-/// Memory of the process that is its own, in MiB.
-double memory() {
-  std::ifstream pages("/proc/self/statm");
-  long size = 0;
-  long resident = 0;
-  pages >> size >> resident;
-  return static_cast<double>(resident) * static_cast<double>(::sysconf(_SC_PAGESIZE)) / 1024 / 1024;
+double mebibytes() {
+  return static_cast<double>(bench::memory()) / 1024 / 1024;
 }
 
 double percentile(std::vector<double> values, double part) {
@@ -176,13 +170,13 @@ void startAndFrames(const std::filesystem::path& documents, std::chrono::millise
     engine.loadData(kEmptyWindow);
     untilFirstFrame(windowOf(engine));
     std::printf("%-44s %7.1f ms\n", "start to first frame, empty window", Milliseconds(Clock::now() - begin).count());
-    baselineMemory = memory();
+    baselineMemory = mebibytes();
   }
   begin = Clock::now();
   Program program(documents, QUORL_SOURCE_DIR "/resources/recordings/mav.jsonl", 1);
   untilFirstFrame(program.window());
   std::printf("%-44s %7.1f ms\n", "start to first frame, product", Milliseconds(Clock::now() - begin).count());
-  std::printf("%-44s %7.1f MiB (empty window %.1f)\n", "memory at first frame", memory(), baselineMemory);
+  std::printf("%-44s %7.1f MiB (empty window %.1f)\n", "memory at first frame", mebibytes(), baselineMemory);
   program.showList();
   print("list on show, no rows", framesOf(program.window(), time, [](double) {}));
   const std::size_t before = program.numberOfRows();
@@ -202,7 +196,7 @@ void memoryInTheLongRun(const std::filesystem::path& documents, std::chrono::sec
   const auto step = std::max(time / 12, std::chrono::seconds(1));
   for (auto passed = 0s; passed <= time; passed += step) {
     std::printf("%4ld s, simulated %5.0f s: %7zu rows, %7.1f MiB\n", static_cast<long>(passed.count()),
-                static_cast<double>(passed.count()) * speed, program.numberOfRows(), memory());
+                static_cast<double>(passed.count()) * speed, program.numberOfRows(), mebibytes());
     std::fflush(stdout);
     spin(step);
   }
