@@ -149,8 +149,10 @@ class Photographer : public WindowPhone {
   }
   void picture(const std::string& name) {
     const auto file = folder_ / fmt::format("{}-{}-{}.png", name, look_.name, look_.isDark ? "dark" : "light");
-    if (!grab().save(QString::fromStdString(file.string())))
+    const QImage shown = grab();
+    if (!shown.save(QString::fromStdString(file.string())))
       throw std::runtime_error(fmt::format("{} could not be written", file.string()));
+    if (shown != drawnAnew()) throw std::runtime_error(fmt::format("{} has traces of earlier frames", file.string()));
     for (const std::string& warning : takeWarnings()) std::cerr << name << ": " << warning << '\n';
   }
 

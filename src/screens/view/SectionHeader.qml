@@ -8,7 +8,8 @@ Rectangle {
     property string text
 
     implicitHeight: label.implicitHeight + 3 * Theme.grid
-    color: Theme.bar
+    // Not quite opaque: of what jumps under an opaque item, software drawing leaves the traces.
+    color: Qt.alpha(Theme.bar, 254 / 255)
     Accessible.role: Accessible.StaticText
     Accessible.name: text
 

@@ -256,6 +256,13 @@ QImage WindowPhone::grab() {
   return window_->grabWindow();
 }
 
+QImage WindowPhone::drawnAnew() {
+  window_->contentItem()->setOpacity(0.5);
+  grab();
+  window_->contentItem()->setOpacity(1);
+  return grab();
+}
+
 void WindowTest::TearDown() {
   for (const std::string& warning : takeWarnings()) ADD_FAILURE() << "warned: " << warning;
 }

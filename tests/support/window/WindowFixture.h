@@ -86,6 +86,8 @@ class WindowPhone {
 
   /// What the window shows now.
   QImage grab();
+  /// The same without what earlier frames may have left: all is drawn when everything's opacity changes.
+  QImage drawnAnew();
 
   /// Warnings since the last call; a fixture fails on any at its end.
   std::vector<std::string> takeWarnings() { return warnings_.take(); }
