@@ -14,7 +14,7 @@
 #include "simulator/network/TestScenarios.h"
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
-#include "support/TimeZone.h"
+#include "support/TimeZoneAndLocale.h"
 
 namespace quorl::simulator {
 namespace {
