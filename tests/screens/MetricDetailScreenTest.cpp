@@ -18,6 +18,13 @@ class MetricDetailScreenTest : public test::ScreenTest {
     settle();
     log.clear();
   }
+  void openCaStatus() {
+    launch();
+    stored(reading("LTE", "CA Status", "0-section-rsrp", "-90"));
+    stored(reading("LTE", "CA Status", "1-section-rsrp", "-95"));
+    stored(reading("LTE", "CA Status", "2-section-rsrp", "-99"));
+    open("LTE", "CA Status");
+  }
   const std::vector<MetricDetailView::Section>& sections() { return screen->view().sections(); }
   MetricDetailsViewCell& cell(std::size_t index, std::size_t section = 0) {
     return *sections().at(section).cells.at(index);
@@ -57,12 +64,21 @@ TEST_F(MetricDetailScreenTest, ASectionedNameAndABandwidthReadAsOnEveryScreen) {
   EXPECT_EQ(cell(1).valueText(), "10 MHz");
 }
 
-TEST_F(MetricDetailScreenTest, CaStatusShowsItsSectionsUnderTheirHeaders) {
+TEST_F(MetricDetailScreenTest, ABandwidthIsToldByTheRawName) {
+  platform.strings.table = {{"dl_bw", "Downlink bandwidth"}, {"power", "dl_bw"}};
+  isMav();
   launch();
-  stored(reading("LTE", "CA Status", "0-section-rsrp", "-90"));
-  stored(reading("LTE", "CA Status", "1-section-rsrp", "-95"));
-  stored(reading("LTE", "CA Status", "2-section-rsrp", "-99"));
-  open("LTE", "CA Status");
+  stored(reading("LTE", "Serving Cell Info", "dl_bw", "50"));
+  stored(reading("LTE", "Serving Cell Info", "power", "25"));
+  open("LTE", "Serving Cell Info");
+  EXPECT_EQ(cell(0).nameText(), "Downlink bandwidth");
+  EXPECT_EQ(cell(0).valueText(), "10 MHz");
+  EXPECT_EQ(cell(1).nameText(), "dl_bw");
+  EXPECT_EQ(cell(1).valueText(), "25");
+}
+
+TEST_F(MetricDetailScreenTest, CaStatusShowsItsSectionsUnderTheirHeaders) {
+  openCaStatus();
   ASSERT_THAT(sections(), SizeIs(2));
   EXPECT_EQ(sections()[0].header, "CA Status 0");
   EXPECT_EQ(sections()[1].header, "CA Status 1");
@@ -110,11 +126,7 @@ TEST_F(MetricDetailScreenTest, ThePinnedRowIsTheOneTappedThoughTheRowsHaveBeenSo
 }
 
 TEST_F(MetricDetailScreenTest, ASectionsRowPinsItself) {
-  launch();
-  stored(reading("LTE", "CA Status", "0-section-rsrp", "-90"));
-  stored(reading("LTE", "CA Status", "1-section-rsrp", "-95"));
-  stored(reading("LTE", "CA Status", "2-section-rsrp", "-99"));
-  open("LTE", "CA Status");
+  openCaStatus();
   cell(0, 1).tapBookmark();
   settle();
   EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE attribute_name = '1-section-rsrp'"), 1);
@@ -208,6 +220,50 @@ TEST_F(MetricDetailScreenTest, ATapOnTheBookmarkOfAReadingThatIsNotMarkedYetUnpi
   EXPECT_EQ(number("SELECT count(*) FROM Dashboard"), 0);
 }
 
+TEST_F(MetricDetailScreenTest, ANewReadingOfASectionKeepsTheBookmarkAndASecondTapUnpins) {
+  openCaStatus();
+  cell(0, 1).tapBookmark();
+  settle();
+  pass(1s);
+  arrives(reading("LTE", "CA Status", "1-section-rsrp", "-70"));
+  ASSERT_EQ(cell(0, 1).valueText(), "-70");
+  EXPECT_TRUE(cell(0, 1).isBookmarked());
+  EXPECT_FALSE(cell(0, 0).isBookmarked());
+  cell(0, 1).tapBookmark();
+  settle();
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard"), 0);
+  pass(1s);
+  arrives(reading("LTE", "CA Status", "1-section-rsrp", "-71"));
+  EXPECT_FALSE(cell(0, 1).isBookmarked());
+}
+
+TEST_F(MetricDetailScreenTest, TheBookmarkOfASectionsRowIsOfItsSubscription) {
+  openCaStatus();
+  cell(0, 1).tapBookmark();
+  for (const char* name : {"0-section-rsrp", "1-section-rsrp", "2-section-rsrp"})
+    stored(reading("LTE", "CA Status", name, "-50", 1));
+  announced(reading("LTE", "CA Status", "0-section-rsrp", "-50", 1));
+  settle();
+  ASSERT_EQ(cell(0, 1).valueText(), "-50");
+  EXPECT_FALSE(cell(0, 1).isBookmarked());
+  announced(reading("LTE", "CA Status", "0-section-rsrp", "-90", 0));
+  settle();
+  ASSERT_EQ(cell(0, 1).valueText(), "-95");
+  EXPECT_TRUE(cell(0, 1).isBookmarked());
+}
+
+TEST_F(MetricDetailScreenTest, ATapOnASectionsRowThatHasGoneLeavesItsAttributeAsItWas) {
+  openCaStatus();
+  const auto before = sections().at(1).cells.at(0);
+  pass(1s);
+  arrives(reading("LTE", "CA Status", "1-section-rsrp", "-70"));
+  before->tapBookmark();
+  pass(1s);
+  arrives(reading("LTE", "CA Status", "1-section-rsrp", "-71"));
+  EXPECT_FALSE(cell(0, 1).isBookmarked());
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard"), 0);
+}
+
 // Graphs.
 
 TEST_F(MetricDetailScreenTest, OnlyBuildsForEngineersAndCarriersShowTheGraphSymbol) {
@@ -245,6 +301,16 @@ TEST_F(MetricDetailScreenTest, ATapOnTheGraphSymbolOpensTheHistoryOfTheRow) {
   ASSERT_NE(history, nullptr);
   EXPECT_EQ(history->metric().attributeNameNonLocalized, "kHVCellMonitorCellId");
   EXPECT_EQ(log.texts("app-ui"), std::vector<std::string>{"MetricDetailsViewController - cancellable - called"});
+}
+
+TEST_F(MetricDetailScreenTest, ATapOnTheGraphSymbolOfASectionsRowOpensTheHistoryOfThatRow) {
+  openCaStatus();
+  std::shared_ptr<AttributeContentDetailsViewController> history;
+  const Connection connection = screen->onOpenGraph([&](auto opened) { history = std::move(opened); });
+  cell(0, 1).tapGraph();
+  ASSERT_NE(history, nullptr);
+  EXPECT_EQ(history->metric().attributeNameNonLocalized, "1-section-rsrp");
+  EXPECT_EQ(history->metric().sectionNumber, "1");
 }
 
 TEST_F(MetricDetailScreenTest, EachTapOnTheGraphSymbolOpensAScreenOfItsOwn) {

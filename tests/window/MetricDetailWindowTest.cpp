@@ -32,6 +32,12 @@ TEST_F(MetricDetailWindowTest, ShowsEachAttributeWithItsLatestValue) {
   EXPECT_THAT(texts(), Contains(HasSubstr("Last seen on: ")));
 }
 
+TEST_F(MetricDetailWindowTest, ABandwidthIsShownInMegahertz) {
+  hasStored(reading("LTE", "Serving Cell Info", "dl_bw", "50"));
+  launchOn("Serving Cell Info");
+  EXPECT_EQ(value(attribute("dl_bw")), "10\u2009MHz");
+}
+
 TEST_F(MetricDetailWindowTest, SpinsInPlaceOfTheRowsOnceAReadTakesLong) {
   hasStored(reading("LTE", "Tx Power", "power", "11"));
   launch();
@@ -131,6 +137,20 @@ TEST_F(MetricDetailWindowTest, CaStatusStandsInItsSections) {
   EXPECT_THAT(column("sectionHeader", "text"), ElementsAre("CA Status 0", "CA Status 1"));
   EXPECT_THAT(column("attributeRow", "name"), ElementsAre("rsrp", "rsrp"));
   EXPECT_THAT(column("attributeRow", "value"), ElementsAre("-90", "-95"));
+}
+
+TEST_F(MetricDetailWindowTest, APinOfASectionSurvivesReadingsThatArrive) {
+  hasStored(reading("LTE", "CA Status", "0-section-rsrp", "-90"));
+  hasStored(reading("LTE", "CA Status", "1-section-rsrp", "-95"));
+  launchOn("CA Status");
+  tap(inRow(attribute("rsrp"), "bookmarkButton"));
+  pass(1s);
+  arrives(reading("LTE", "CA Status", "0-section-rsrp", "-70"));
+  EXPECT_EQ(value(attribute("rsrp")), "-70");
+  EXPECT_EQ(bookmark("rsrp"), "bookmark.fill");
+  tap(inRow(attribute("rsrp"), "bookmarkButton"));
+  EXPECT_EQ(bookmark("rsrp"), "bookmark");
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE attribute_name = '0-section-rsrp'"), 0);
 }
 
 TEST_F(MetricDetailWindowTest, ALongValueTakesSeveralLinesInsideItsRow) {

@@ -22,7 +22,7 @@ void MetricDetailView::refresh() {
   Earlier earlier;
   for (const Section& section : sections_) {
     for (const auto& cell : section.cells) {
-      earlier.byId.emplace(cell->metricObject().id, cell);
+      earlier.byId.emplace(std::pair(section.header, cell->metricObject().id), cell);
       earlier.byName.emplace(std::pair(section.header, cell->metricObject().attributeNameNonLocalized), cell);
     }
   }
@@ -37,8 +37,10 @@ void MetricDetailView::refresh() {
 
 void MetricDetailView::refreshBookmarks() {
   refresh();
-  for (const Section& section : sections_)
+  for (const Section& section : sections_) {
+    if (!section.header.empty()) continue;
     for (const auto& cell : section.cells) cell->mark();
+  }
   changed_();
 }
 
@@ -47,16 +49,24 @@ MetricDetailView::Section MetricDetailView::makeSection(std::string header, cons
   Section section{std::move(header), {}};
   section.cells.reserve(rows.size());
   for (const Metric& row : rows) {
-    if (const auto same = earlier.byId.find(row.id); same != earlier.byId.end()) {
+    if (const auto same = earlier.byId.find({section.header, row.id}); same != earlier.byId.end()) {
       section.cells.push_back(same->second);
       same->second->update(row);
       continue;
     }
-    const auto before = earlier.byName.find({section.header, row.attributeNameNonLocalized});
-    const bool isBookmarked = before == earlier.byName.end() ? row.isBookmarked : before->second->isBookmarked();
-    section.cells.push_back(makeCell(row, isBookmarked, isSectioned));
+    section.cells.push_back(makeCell(row, startsBookmarked(section.header, row, isSectioned, earlier), isSectioned));
   }
   return section;
+}
+
+bool MetricDetailView::startsBookmarked(const std::string& header, const Metric& row, bool isSectioned,
+                                        const Earlier& earlier) const {
+  if (isSectioned) {
+    const auto flipped = flipped_.find({row.subsId, row.attributeNameNonLocalized});
+    return flipped == flipped_.end() ? row.isBookmarked : flipped->second;
+  }
+  const auto before = earlier.byName.find({header, row.attributeNameNonLocalized});
+  return before == earlier.byName.end() ? row.isBookmarked : before->second->isBookmarked();
 }
 
 std::shared_ptr<MetricDetailsViewCell> MetricDetailView::makeCell(const Metric& row, bool isBookmarked,
@@ -68,6 +78,8 @@ std::shared_ptr<MetricDetailsViewCell> MetricDetailView::makeCell(const Metric& 
   };
   actions.bookMarkAction = [this, id = row.id, isSectioned](bool isPinned) {
     const Place place = placeOf(id, isSectioned);
+    if (const Metric* metric = viewModel_->row(place.index, place.sectionIndex, isSectioned))
+      flipped_[{metric->subsId, metric->attributeNameNonLocalized}] = isPinned;
     viewModel_->updateDashboardItem(place.index, isPinned, place.sectionIndex, isSectioned);
   };
   actions.onCopyAction = [this] { showToast_.show(); };

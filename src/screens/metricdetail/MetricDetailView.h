@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <map>
 #include <memory>
 #include <string>
@@ -42,21 +43,25 @@ class MetricDetailView {
   Toast& showToast() { return showToast_; }
 
   /// Takes the model's state on show. A row that is still the same reading keeps its cell, and so what the user has
-  /// flipped in it; a new reading of an attribute starts with the bookmark that the one before shows.
+  /// flipped in it; a new reading of an attribute starts with the bookmark that the one before shows. Rows of sections
+  /// show what the user has made of their attribute on this screen.
   void refresh();
-  /// The same with the bookmarks, which the model has marked now.
+  /// The same with the bookmarks, which the model has marked now, but for those of sections.
   void refreshBookmarks();
   /// `handler` runs after every change of a text, of the rows or of the spinner.
   [[nodiscard]] Connection onChange(Signal<>::Handler handler) { return changed_.connect(std::move(handler)); }
 
  private:
-  /// Cells shown before: by reading, and by attribute (header and raw name).
+  /// Cells shown before, with the header above them: by reading, and by attribute (raw name).
   struct Earlier {
-    std::map<Uuid, std::shared_ptr<MetricDetailsViewCell>> byId;
+    std::map<std::pair<std::string, Uuid>, std::shared_ptr<MetricDetailsViewCell>> byId;
     std::map<std::pair<std::string, std::string>, std::shared_ptr<MetricDetailsViewCell>> byName;
   };
+  /// Subscription and raw name.
+  using Attribute = std::pair<std::int32_t, std::string>;
 
   Section makeSection(std::string header, const std::vector<Metric>& rows, bool isSectioned, const Earlier& earlier);
+  bool startsBookmarked(const std::string& header, const Metric& row, bool isSectioned, const Earlier& earlier) const;
   std::shared_ptr<MetricDetailsViewCell> makeCell(const Metric& row, bool isBookmarked, bool isSectioned);
   /// Where a row stands in the model now. An index that no row has when it is gone.
   struct Place {
@@ -68,6 +73,9 @@ class MetricDetailView {
   const std::shared_ptr<MetricDetailViewModel> viewModel_;
   MetricDetailViewDelegate viewProtocol_;
   std::vector<Section> sections_;
+  /// Pins (true) and removals that the user asked for here. The model leaves rows of sections unmarked, and takes the
+  /// sections away in the middle of each load, so this is all that tells their bookmarks.
+  std::map<Attribute, bool> flipped_;
   Toast showToast_;
   Signal<> changed_;
   Connection modelConnection_;
