@@ -105,6 +105,15 @@ TEST_F(ExportWindowTest, OffersThreeTimeFrames) {
   EXPECT_FALSE(isShown("exportHeading"));
 }
 
+TEST_F(ExportWindowTest, TheCrossThatClosesItIsThirtyByThirty) {
+  launchOnExport();
+  const QRectF cross = place(find("symbol", find("closeButton")));
+  EXPECT_EQ(cross.size(), QSizeF(30, 30));
+  EXPECT_EQ(cross.center(), place(find("closeButton")).center());
+  EXPECT_GE(place(find("closeButton")).width(), 44);
+  EXPECT_GE(place(find("closeButton")).height(), 44);
+}
+
 TEST_F(ExportWindowTest, WritesTheTextOfTheFrameToAFileOfItsName) {
   hasStored(reading("LTE", "Tx Power", "power", "11"));
   hasStored(reading("LTE", "Tx Power", "band", "3, and a comma"));

@@ -7,6 +7,7 @@ T.AbstractButton {
     id: button
 
     property string symbol
+    property int symbolSize: 24
     property color tint: Theme.buttonSelected
 
     implicitWidth: Theme.touch
@@ -18,7 +19,9 @@ T.AbstractButton {
 
     contentItem: Item {
         Symbol {
+            objectName: "symbol"
             anchors.centerIn: parent
+            size: button.symbolSize
             symbol: button.symbol
             color: button.tint
         }

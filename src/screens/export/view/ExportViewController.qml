@@ -28,6 +28,7 @@ FocusScope {
         anchors.right: parent.right
         anchors.margins: Theme.grid
         symbol: "xmark"
+        symbolSize: 30
         text: qsTr("Close")
         onClicked: root.binding.dismiss()
     }
