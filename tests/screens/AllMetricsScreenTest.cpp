@@ -1,4 +1,5 @@
 #include "ScreenTest.h"
+#include "app/HardwareManager.h"
 #include "screens/metriclist/AllMetricsViewController.h"
 
 namespace quorl {
@@ -133,6 +134,21 @@ TEST_F(AllMetricsScreenTest, ATapOpensTheDetailOfTheRow) {
   EXPECT_EQ(detail->metricDetailsViewModel()->collectedOn(), seen);
   EXPECT_THAT(log.texts("allmetrics"),
               ElementsAre("AllMetricsViewModel - pullToRefresh didSelectItemAt GroupTec LTE GroupRowItem Tx Power"));
+}
+
+TEST_F(AllMetricsScreenTest, TheDetailIsOfTheRowsSubscription) {
+  HardwareManager::shared().setCurrentSubsId(1);
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "20", 1));
+  open();
+  HardwareManager::shared().setCurrentSubsId(0);  // another is chosen, and the list has not followed yet
+  std::shared_ptr<MetricDetailsViewController> detail;
+  const Connection connection = screen->onOpenDetail([&](auto opened) { detail = std::move(opened); });
+  screen->didSelectItemAt(1, 0);
+  ASSERT_NE(detail, nullptr);
+  EXPECT_EQ(detail->metricDetailsViewModel()->subsId(), 1);
+  settle();
+  EXPECT_THAT(detail->metricDetailsViewModel()->metrics(), SizeIs(1));
 }
 
 TEST_F(AllMetricsScreenTest, AFixedTelephonyRowTakesTheSamePath) {

@@ -114,6 +114,21 @@ TEST_F(ManageDashboardTest, TheControlOpensItWithThePinsOfTheCurrentSubscription
   EXPECT_TRUE(log.has(line("general", "show manage dashboard UI")));
 }
 
+TEST_F(ManageDashboardTest, AChosenSubscriptionBringsItsOwnPinsAndASwipeLeavesThoseOfTheOther) {
+  openWithTwoReadings();
+  pinned("LTE", "Tx Power", "power", 1);
+  pinned("LTE", "Tx Power", "index", 1);
+  chooses(1);
+  openManaging();
+  EXPECT_THAT(pins(), ElementsAre("index", "power"));
+  chooses(0);  // while it is open
+  managing->swipeToDelete(1);
+  settle();
+  EXPECT_THAT(pins(), ElementsAre("index"));
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE attribute_name = 'power' AND subs_id = 1"), 0);
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE attribute_name = 'power' AND subs_id = 0"), 1);
+}
+
 TEST_F(ManageDashboardTest, TheControlOpensNothingWhenThePinsCannotBeRead) {
   openWithTwoReadings();
   loses("Dashboard");

@@ -1,4 +1,5 @@
 #include <algorithm>
+#include <functional>
 #include <map>
 
 #include "ScreenTest.h"
@@ -20,8 +21,12 @@ using ::testing::UnorderedElementsAre;
 using namespace std::chrono_literals;
 
 struct DashboardScreen final : DashboardViewModelDelegate {
-  void updateLastRefreshed(const std::string& text) override { refreshed.push_back(text); }
+  void updateLastRefreshed(const std::string& text) override {
+    refreshed.push_back(text);
+    if (atRefresh) atRefresh();
+  }
   std::vector<std::string> refreshed;
+  std::function<void()> atRefresh;
 };
 
 class DashboardTest : public test::ScreenTest {
@@ -47,6 +52,12 @@ class DashboardTest : public test::ScreenTest {
     std::vector<std::string> names;
     for (const DashboardViewModelObject& row : model->metrics()) names.push_back(row.attributeName);
     return names;
+  }
+  bool allLinesAreDefault() const {
+    const auto lines = log.lines();
+    return std::all_of(lines.begin(), lines.end(), [](const test::LogLine& logged) {
+      return logged.category != "dashboard" || logged.level == LogLevel::Default;
+    });
   }
   void aPinIsRemovedElsewhere() {
     NotificationCenter::defaultCenter().post(notification::kRemovedDashboardMetric);
@@ -98,11 +109,7 @@ TEST_F(DashboardTest, AStartWithReadingsLogsItsSteps) {
                           "DashboardViewModel -  loadDashboardData - dashboardList.count 2",
                           "DashboardViewModel -  init -  loadDashboardData success",
                           "DashboardViewModel -  updateDashboardDataSource()"));
-  for (const test::LogLine& logged : log.lines()) {
-    if (logged.category == "dashboard") {
-      EXPECT_EQ(logged.level, LogLevel::Default);
-    }
-  }
+  EXPECT_TRUE(allLinesAreDefault());
 }
 
 TEST_F(DashboardTest, AFirstStartOnAMavDeviceInsertsTwentyEightPins) {
@@ -130,6 +137,7 @@ TEST_F(DashboardTest, AFirstStartWithoutReadingsLogsItsStepsAndStaysWithoutATime
                           "DashboardViewModel -  loadInitialDashboard() ", "DashboardViewModel -  loadDashboardData() ",
                           "DashboardViewModel -  loadDashboardData - dashboardList.count 6",
                           "DashboardViewModel -  init -  loadInitialDashboard failed: nil"));
+  EXPECT_TRUE(allLinesAreDefault());
   EXPECT_EQ(model->state(), State::seeding);
   log.clear();
   pass(1h);
@@ -269,6 +277,15 @@ TEST_F(DashboardTest, TheTimerEndsWithTheModel) {
   EXPECT_THAT(log.texts("dashboard"), IsEmpty());
 }
 
+TEST_F(DashboardTest, ATickRefreshesTheRowsBeforeItTellsItsTime) {
+  openWithTwoReadings();
+  sql("UPDATE Metric SET attribute_value = '12' WHERE attribute_name = 'power'");
+  std::string atRefresh;
+  screen->atRefresh = [&] { atRefresh = shown()["power"]; };
+  pass(15s);
+  EXPECT_EQ(atRefresh, "12");
+}
+
 // The merge.
 
 TEST_F(DashboardTest, AnUnchangedValueStillLogsAndSignalsEachTick) {
@@ -279,9 +296,34 @@ TEST_F(DashboardTest, AnUnchangedValueStillLogsAndSignalsEachTick) {
   EXPECT_EQ(changes,
             (std::vector<DashboardChange>{
                 {Kind::attributeValue, 0}, {Kind::timeStamp, 0}, {Kind::attributeValue, 1}, {Kind::timeStamp, 1}}));
+  EXPECT_TRUE(log.has(line("dashboard", "DashBoardViewModel - Updating value and timestamp for key : Tx Powerpower ")));
   EXPECT_EQ(log.count("DashBoardViewModel - Updating value and timestamp for key : Tx Powerpower "), 1U);
   EXPECT_EQ(log.count("DashBoardViewModel - Updating value and timestamp for key : Tx Powerband "), 1U);
   EXPECT_TRUE(log.has(line("dashboard", "DashboardViewModel -  updateDashboardDataSource()")));
+}
+
+TEST_F(DashboardTest, TheTimeOfAReadingIsTakenOverWithItsValue) {
+  openWithTwoReadings();
+  pass(1s);
+  const Date later = now();
+  arrives(reading("LTE", "Tx Power", "power", "12"));
+  pass(14s);
+  for (const DashboardViewModelObject& row : model->metrics())
+    EXPECT_EQ(row.timeStamp, row.attributeName == "power" ? later : later - 1s) << row.attributeName;
+}
+
+TEST_F(DashboardTest, TheKeyOfTheMergeIsMadeOfTheNameShown) {
+  platform.strings.table = {{"power", "Transmit power"}};
+  openWithTwoReadings();
+  pass(15s);
+  EXPECT_EQ(log.count("DashBoardViewModel - Updating value and timestamp for key : Tx PowerTransmit power "), 1U);
+  Metric sameName = reading("LTE", "Tx Power", "tx_power", "20");
+  sameName.attributeName = "Transmit power";
+  std::vector<DashboardChange> changes;
+  const Connection connection = model->onChange([&](const DashboardChange& change) { changes.push_back(change); });
+  model->updateDashboardDataSource({reading("LTE", "Tx Power", "band", "3"), sameName});
+  EXPECT_THAT(shown(), UnorderedElementsAre(Pair("band", "3"), Pair("Transmit power", "20")));
+  EXPECT_EQ(changes.size(), 4U);  // a value and a time each: no row has come or gone
 }
 
 TEST_F(DashboardTest, ANewAttributeGoesToTheEnd) {
@@ -333,6 +375,7 @@ TEST_F(DashboardTest, OfTwoReadingsOfOneKeyTheLaterWins) {
 }
 
 TEST_F(DashboardTest, ASectionIsTheFirstPieceOfTheRawName) {
+  platform.strings.table = {{"1-section-rsrp", "Signal"}, {"power", "2-section-power"}};
   launch();
   pinned("LTE", "CA Status", "1-section-rsrp");
   pinned("LTE", "Tx Power", "power");
@@ -340,7 +383,8 @@ TEST_F(DashboardTest, ASectionIsTheFirstPieceOfTheRawName) {
   stored(reading("LTE", "Tx Power", "power", "11"));
   open();
   for (const DashboardViewModelObject& row : model->metrics()) {
-    if (row.attributeName == "power") {
+    if (row.attributeNameNonLocalized == "power") {
+      EXPECT_EQ(row.attributeName, "2-section-power");
       EXPECT_EQ(row.section, std::nullopt);
     } else {
       EXPECT_EQ(row.section, "1");

@@ -221,6 +221,16 @@ TEST_F(ExportTest, BothSubscriptionsAreMixedAndToldApartBySubsId) {
   EXPECT_THAT(shared(), HasSubstr("subsId: 1"));
 }
 
+TEST_F(ExportTest, BothNamesOfAnAttributeArePrinted) {
+  platform.strings.table = {{"power", "Transmit power"}};
+  launch();
+  stored(power("11"));
+  open();
+  taps("Daily");
+  settle();
+  EXPECT_THAT(shared(), HasSubstr("attributeName: Transmit power, attributeNameNonLocalized: power, "));
+}
+
 TEST_F(ExportTest, NothingStoredGivesAnEmptyText) {
   launch();
   open();

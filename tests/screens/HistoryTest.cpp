@@ -113,6 +113,23 @@ TEST_F(HistoryTest, TheTitleAndHeaderAreTheNameShown) {
   EXPECT_EQ(screen->view()->headerText(), "Cell ID average");
 }
 
+TEST_F(HistoryTest, IsReadByTheRawNameInEachTimeFrame) {
+  launch();
+  Metric metric = cellId("30");
+  stored(metric);
+  Metric other = metric;
+  other.attributeName = other.attributeNameNonLocalized = "Cell ID";
+  other.attributeValue = "99";
+  stored(other);
+  metric.attributeName = "Cell ID";
+  screen = AttributeContentDetailsViewController::make(store, metric);
+  screen->viewDidLoad();
+  settle();
+  EXPECT_THAT(values(model().daily()), ElementsAre("30"));
+  EXPECT_THAT(values(model().weekly()), ElementsAre("30.0"));
+  EXPECT_THAT(values(model().monthly()), ElementsAre("30.0"));
+}
+
 TEST_F(HistoryTest, TellsWhenTheViewIsThere) {
   launch();
   screen = AttributeContentDetailsViewController::make(store, cellId("30"));

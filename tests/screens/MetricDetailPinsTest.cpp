@@ -29,6 +29,20 @@ TEST_F(MetricDetailPinsTest, APinOfTheOtherSubscriptionMarksNothing) {
   EXPECT_FALSE(isMarked("power"));
 }
 
+TEST_F(MetricDetailPinsTest, ALoadForTheOtherSubscriptionMarksByItsPins) {
+  launch();
+  for (const char* name : {"band", "power"}) {
+    stored(reading("LTE", "Tx Power", name, "1", 0));
+    stored(reading("LTE", "Tx Power", name, "2", 1));
+  }
+  pinned("LTE", "Tx Power", "power", 0);
+  pinned("LTE", "Tx Power", "band", 1);
+  opened("LTE", "Tx Power", 0);
+  arrives(reading("LTE", "Tx Power", "index", "3", 1));
+  EXPECT_TRUE(isMarked("band"));
+  EXPECT_FALSE(isMarked("power"));
+}
+
 TEST_F(MetricDetailPinsTest, APinOfTheSameNameOfAnotherMetricMarksAsMeant) {
   launch();
   stored(reading("LTE", "Tx Power", "power", "11"));
@@ -85,6 +99,36 @@ TEST_F(MetricDetailPinsTest, PinningUsesTheRawName) {
   model->updateDashboardItem(0, true, 0, false);
   settle();
   EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE attribute_name = 'power'"), 1);
+}
+
+TEST_F(MetricDetailPinsTest, UnpinningUsesTheRawName) {
+  platform.strings.table = {{"power", "Power"}};
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11"));
+  pinned("LTE", "Tx Power", "power");
+  pinned("LTE", "Tx Power", "Power");
+  opened("LTE", "Tx Power");
+  model->updateDashboardItem(0, false, 0, false);
+  settle();
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE attribute_name = 'power'"), 0);
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard"), 1);
+}
+
+TEST_F(MetricDetailPinsTest, ARowOfTheSubscriptionThatTookTheScreenOverIsPinnedAndUnpinnedForThatOne) {
+  launch();
+  stored(reading("LTE", "Tx Power", "power", "11", 0));
+  opened("LTE", "Tx Power", 0);
+  arrives(reading("LTE", "Tx Power", "power", "20", 1));
+  ASSERT_EQ(model->subsId(), 0);
+  model->updateDashboardItem(0, /*isBookmarked=*/true, 0, false);
+  settle();
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE subs_id = 1"), 1);
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE subs_id = 0"), 0);
+  pinned("LTE", "Tx Power", "power", 0);
+  model->updateDashboardItem(0, /*isBookmarked=*/false, 0, false);
+  settle();
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE subs_id = 1"), 0);
+  EXPECT_EQ(number("SELECT count(*) FROM Dashboard WHERE subs_id = 0"), 1);
 }
 
 TEST_F(MetricDetailPinsTest, PinningARowOfASection) {

@@ -6,6 +6,7 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::Pair;
+using ::testing::UnorderedElementsAre;
 using namespace std::chrono_literals;
 
 constexpr char kDeployment[] = "kHVCellMonitorDeploymentType";
@@ -72,6 +73,21 @@ TEST_F(MetricSectionsTest, TheDeploymentRuleIsForCellInfoAlone) {
   EXPECT_THAT(shown(), ElementsAre(Pair(kDeployment, "2")));
 }
 
+TEST_F(MetricSectionsTest, TheRowsOfCellInfoAreFoundByTheirRawNames) {
+  platform.strings.table = {{kDeployment, "Deployment"},
+                            {kTechnology, "Technology"},
+                            {"kHVCellMonitorBandInfo", kDeployment},
+                            {"kHVCellMonitorTAC", kTechnology}};
+  launch();
+  cellInfo(kTechnology, "LTE");
+  cellInfo(kDeployment, "2");
+  cellInfo("kHVCellMonitorBandInfo", "3");
+  cellInfo("kHVCellMonitorTAC", "LTE");
+  opened("RAT", "Cell Info");
+  EXPECT_THAT(shown(), UnorderedElementsAre(Pair(kDeployment, "5G NSA (2)"), Pair("kHVCellMonitorBandInfo", "3"),
+                                            Pair("kHVCellMonitorTAC", "LTE")));
+}
+
 // "CA Status".
 
 TEST_F(MetricSectionsTest, CaStatusMakesASectionForEachNumberBelowTheLastRowsAsMeant) {
@@ -101,6 +117,47 @@ TEST_F(MetricSectionsTest, ALastRowWithoutANumberEndsTheWorkWithoutSectionsAsMea
   opened("LTE", "CA Status");
   EXPECT_THAT(model->metricSectionals(), IsEmpty());
   EXPECT_EQ(model->metrics().size(), 2U);
+}
+
+TEST_F(MetricSectionsTest, SectionsAreToldByTheRawNames) {
+  platform.strings.table = {
+      {"0-section-rsrp", "Signal"}, {"1-section-rsrp", "Other signal"}, {"0-pci", "0-section-pci"}};
+  launch();
+  caStatus("0-section-rsrp", "-90");
+  caStatus("1-section-rsrp", "-95");
+  caStatus("0-pci", "7");
+  caStatus("1-section-pci", "8");
+  opened("LTE", "CA Status");
+  ASSERT_EQ(model->metricSectionals().size(), 1U);
+  ASSERT_EQ(model->metricSectionals()[0].sectionMetrics.size(), 1U);
+  EXPECT_EQ(model->metricSectionals()[0].sectionMetrics[0].attributeName, "Signal");
+}
+
+TEST_F(MetricSectionsTest, TheLastRowIsThatOfTheReadAndNotOfTheNamesShown) {
+  platform.strings.table = {
+      {"0-section-dl_bw", "Z"}, {"0-section-rsrp", "Y"}, {"1-section-rsrp", "X"}, {"2-section-rsrp", "A"}};
+  launch();
+  caStatus("0-section-dl_bw", "100");
+  caStatus("0-section-rsrp", "-90");
+  caStatus("1-section-rsrp", "-95");
+  caStatus("2-section-rsrp", "-99");
+  opened("LTE", "CA Status");
+  ASSERT_EQ(model->metrics().front().attributeName, "A");
+  ASSERT_EQ(model->metricSectionals().size(), 2U);
+  // So are the rows of a section.
+  ASSERT_EQ(model->metricSectionals()[0].sectionMetrics.size(), 2U);
+  EXPECT_EQ(model->metricSectionals()[0].sectionMetrics[0].attributeName, "Z");
+}
+
+TEST_F(MetricSectionsTest, ALastRowWhoseNumberIsNoIntegerGivesNoSections) {
+  launch();
+  caStatus("0-section-rsrp", "-90");
+  for (const char* name : {"3a-section-rsrp", "4.5-section-rsrp", "section-rsrp"}) {
+    pass(1s);
+    caStatus(name, "-95");
+    opened("LTE", "CA Status");
+    EXPECT_THAT(model->metricSectionals(), IsEmpty()) << name;
+  }
 }
 
 TEST_F(MetricSectionsTest, ASectionWithoutRowsIsEmpty) {
