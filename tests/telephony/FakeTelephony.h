@@ -95,7 +95,10 @@ class FakeTelephony final : public HorvaneClientFactory {
   class NetworkInfo final : public HVTelephonyNetworkInfo {
    public:
     explicit NetworkInfo(FakeTelephony& fake) : fake_(fake) {}
-    std::optional<std::map<std::string, HVCarrier>> subscriberProviders() override { return fake_.providers; }
+    std::optional<std::map<std::string, HVCarrier>> subscriberProviders() override {
+      fake_.calls.emplace_back("subscriberProviders");
+      return fake_.providers;
+    }
 
    private:
     FakeTelephony& fake_;

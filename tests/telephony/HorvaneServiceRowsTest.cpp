@@ -127,6 +127,7 @@ TEST_F(HorvaneServiceRowsTest, BuilderLogsALineForEveryRow) {
   start();
   EXPECT_EQ(log.count("HorvaneService - cellInfoDBBuilder"), store.inserted.size());
   EXPECT_EQ(store.inserted.size(), 4U);
+  EXPECT_TRUE(logged("HorvaneService - cellInfoDBBuilder"));
 }
 
 TEST_F(HorvaneServiceRowsTest, EachInsertedRowIsPostedOnceOnTheMainQueue) {

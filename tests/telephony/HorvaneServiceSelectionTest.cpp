@@ -159,14 +159,14 @@ TEST_F(HorvaneServiceSelectionTest, SlotThatLostItsSimLeavesTheList) {
   EXPECT_EQ(hardware().currentSubsId(), 1);
 }
 
-TEST_F(HorvaneServiceSelectionTest, CellMonitorUpdateStoresItsOwnCellAndAsksForBandsLast) {
+TEST_F(HorvaneServiceSelectionTest, CellMonitorUpdateStoresItsOwnCellAndAsksForCarriersThenForBands) {
   internalBuild();
   insertSim(1, "Testnet One");
   start();
   telephony.calls.clear();
   store.inserted.clear();
   monitor(1, true, cellOf({{"kHVCellMonitorTAC", std::int64_t{9}}}));
-  EXPECT_THAT(telephony.calls, ElementsAre("getSignalStrengthMeasurements 1", "getBandInfo 1"));
+  EXPECT_THAT(telephony.calls, ElementsAre("getSignalStrengthMeasurements 1", "subscriberProviders", "getBandInfo 1"));
   EXPECT_THAT(store.values("Cell Info"), ElementsAre(std::pair("kHVCellMonitorTAC", "9"), std::pair("PLMN", "0 0")));
 }
 

@@ -16,6 +16,7 @@ TEST_F(HorvaneServiceStartTest, AsksForTheSubscriptionsAtOnceThroughAClientOnThe
   EXPECT_THAT(telephony.calls, ElementsAre("initWithQueue main", "setDelegate", "getSubscriptionInfo"));
   EXPECT_EQ(telephony.delegate.lock(), service);
   EXPECT_THAT(log.texts(log_category::kHorvaneService), ElementsAre("HorvaneService - init"));
+  EXPECT_TRUE(logged("HorvaneService - init"));
 }
 
 TEST_F(HorvaneServiceStartTest, HearsActivationsFromFiveSecondsOn) {
@@ -95,15 +96,16 @@ TEST_F(HorvaneServiceStartTest, PhoneWithoutSimsAsksForNothingMore) {
   EXPECT_THAT(telephony.calls, ElementsAre("initWithQueue main", "setDelegate", "getSubscriptionInfo"));
 }
 
-TEST_F(HorvaneServiceStartTest, EachRecordIsAskedForBandsThenItsCellThenItsMeasurementOnceMore) {
+TEST_F(HorvaneServiceStartTest, EachRecordBringsTheCarriersThenItsBandsThenItsCellThenItsMeasurementOnceMore) {
   internalBuild();
   insertSim(1, "Testnet One");
   insertSim(2, "Testnet Two");
   service = HorvaneService::make(store);
   telephony.calls.clear();
   platform.mainQueue->step();
-  EXPECT_THAT(telephony.calls, ElementsAre("getBandInfo 1", "copyCellInfo 1", "getSignalStrengthMeasurements 1",
-                                           "getBandInfo 2", "copyCellInfo 2", "getSignalStrengthMeasurements 2"));
+  EXPECT_THAT(telephony.calls,
+              ElementsAre("subscriberProviders", "getBandInfo 1", "copyCellInfo 1", "getSignalStrengthMeasurements 1",
+                          "subscriberProviders", "getBandInfo 2", "copyCellInfo 2", "getSignalStrengthMeasurements 2"));
 }
 
 TEST_F(HorvaneServiceStartTest, CarrierUpdateGoesOutOncePerRecordWithTheWholeList) {
