@@ -42,6 +42,17 @@ TEST_F(DashboardWindowTest, ABandwidthHasAThinSpaceBeforeItsUnitAndIsCopiedWithA
   EXPECT_EQ(phone.pasteboard.text, "10 MHz");
 }
 
+TEST_F(DashboardWindowTest, AnAttributeOfASectionIsNamedWithItHereAndWhereItIsManaged) {
+  hasADashboard();
+  const Metric signal = reading("LTE", "CA Status", "1-section-rsrp", "-95");
+  hasStored(signal);
+  hasPinned(signal);
+  launch();
+  EXPECT_EQ(value(attribute("rsrp (CA 1)")), "-95");
+  opensManaging();
+  EXPECT_NE(managed("rsrp (CA 1)"), nullptr);
+}
+
 TEST_F(DashboardWindowTest, AValueChangesInItsPlaceAtTheNextTick) {
   hasADashboard();
   launch();

@@ -2,6 +2,7 @@
 #include <algorithm>
 
 #include "ScreenWindow.h"
+#include "base/DateText.h"
 
 namespace quorl {
 namespace {
@@ -47,6 +48,19 @@ TEST_F(HistoryWindowTest, DrawsABarForEachReadingOfToday) {
   EXPECT_EQ(find("barBody", bars[0])->width(), 30);
   EXPECT_NEAR(height(bars[0]), 2 * height(bars[1]), 1e-6);
   EXPECT_EQ(place(find("barBody", bars[0])).bottom(), place(find("barBody", bars[1])).bottom());
+}
+
+TEST_F(HistoryWindowTest, TheLargestBarLeavesFortyOfThePlotAndADaysBarIsLabelledWithTheDay) {
+  const Metric largest = cellId("100");
+  hasStored(largest);
+  hasStored(cellId("50"));
+  launchOnGraph();
+  EXPECT_NEAR(place(find("barBody", findAll("bar").at(0))).top(), place(find("bars")).top() + 40, 1e-6);
+  EXPECT_EQ(text("barLabel"), patternText(largest.collectedOn, "HH:mm zz"));
+  selects(1);
+  pass(500ms);
+  ASSERT_THAT(findAll("bar"), SizeIs(1));
+  EXPECT_EQ(text("barLabel"), patternText(largest.collectedOn, "EE, MM/dd"));
 }
 
 TEST_F(HistoryWindowTest, TheAttributeIsNamedOnce) {

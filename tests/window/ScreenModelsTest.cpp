@@ -15,6 +15,7 @@
 #include "screens/metricdetail/view/MetricDetailsListModel.h"
 #include "screens/metriclist/view/AllMetricsListModel.h"
 #include "support/FakePlatform.h"
+#include "support/TimeZoneAndLocale.h"
 
 namespace quorl::view {
 namespace {
@@ -138,6 +139,29 @@ TEST_F(ScreenModelsTest, GraphBars) {
       model.take();
       ASSERT_EQ(model.rowCount(), static_cast<int>(viewModel->dataSource().size()));
     }
+  }
+}
+
+TEST_F(ScreenModelsTest, BarsOfADayAreLabelledWithTheTimeAndOthersWithTheDay) {
+  const test::ScopedTimeZone zone("UTC");
+  const test::ScopedLocale locale("en_US");
+  Metric metric = row();
+  metric.collectedOn = Date(std::chrono::seconds(1767605412));
+  metric.attributeValue = "50";
+  Metric half = metric;
+  half.attributeValue = "25";
+  const std::vector<Metric> both{metric, half};
+  const auto viewModel = std::make_shared<AttributeDetailsViewModel>(both, both, both);
+  GraphBarsModel model;
+  model.setPlotHeight(240);
+  model.setView(std::make_shared<AttributeDetailsView>(viewModel, "attribute"));
+  for (const auto& [segment, label] :
+       {std::pair(0, "09:30 UTC"), std::pair(1, "Mon, 01/05"), std::pair(2, "Mon, 01/05")}) {
+    viewModel->selectSegment(segment);
+    model.take();
+    EXPECT_EQ(model.index(1).data(GraphBarsModel::LabelRole).toString().toStdString(), label);
+    EXPECT_EQ(model.index(0).data(GraphBarsModel::HeightRole).toDouble(), 200);
+    EXPECT_EQ(model.index(1).data(GraphBarsModel::HeightRole).toDouble(), 100);
   }
 }
 
