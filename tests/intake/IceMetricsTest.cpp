@@ -12,6 +12,9 @@ namespace {
 constexpr std::int64_t kCaStatus = 0x3CD313;
 constexpr std::int64_t kUmtsServingCell = 0x3CD102;
 constexpr std::int64_t kUmtsNeighborCells = 0x3CD105;
+constexpr std::int64_t kSimFiles = 0x3C0013;
+constexpr std::int64_t kLteTxPower = 0x3CD302;
+constexpr std::int64_t kComponentCarriers = 0x3CD30B;
 
 class IceMetricsTest : public IntakeTest {
  protected:
@@ -255,6 +258,44 @@ TEST_F(IceDeviceTest, UmtsNeighborCellsGoToThreeRowsOfTheCatalogue) {
                                                    "UMTS/LTE Neighbor Cell Meas"}));
   EXPECT_EQ(rows("GSM Neighbor Cell Meas"),
             (std::vector<std::string>{"ecno=-19.5 INT", "rscp=-96 INT", "subs_id=1 INT"}));
+}
+
+TEST_F(IceDeviceTest, SimFilesKeepTheLastFileWithoutItsContent) {
+  metricArrives(kSimFiles, Payload()
+                               .number(1, 5)
+                               .message(2, Payload().number(1, 0x6F07).bytes(2, "\x08\x49"))
+                               .message(2, Payload().number(1, 0x6FAD).bytes(2, "\x01"))
+                               .number(15, 1));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"ef_id=28589 INT", "subs_id=1 INT"}));
+  EXPECT_EQ(rowGroups(), (std::vector<std::string>{"Device Info/SIM Files"}));
+  EXPECT_EQ(unknownValueLines(), (std::vector<std::string>{"unknown attributevalue  ---> <1 bytes>"}));
+}
+
+TEST_F(IceDeviceTest, LteTxPowerKeepsTheLastFrameAndHasNoTimestamp) {
+  metricArrives(kLteTxPower, Payload()
+                                 .number(1, 1700000000123)
+                                 .message(2, Payload().signedNumber(1, -8).signedNumber(2, -12).number(3, 4))
+                                 .message(2, Payload().signedNumber(2, 23).number(3, 5))
+                                 .bytes(3, "call")
+                                 .number(10, 3)
+                                 .number(15, 1));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"dpcch_tx_power=-8 INT", "total_tx_power=23 INT", "frame_index=5 INT",
+                                              "subs_id=1 INT"}));
+  EXPECT_EQ(rowGroups(), (std::vector<std::string>{"LTE/Tx Power"}));
+  EXPECT_EQ(store.rows[0].collectedOn, Date(std::chrono::milliseconds(1700000000123)));
+}
+
+TEST_F(IceDeviceTest, ComponentCarriersNameTheirBandwidthUnconverted) {
+  metricArrives(kComponentCarriers, Payload()
+                                        .number(1, 5)
+                                        .number(2, 1300)
+                                        .number(5, 100)
+                                        .message(11, Payload().number(1, 1300).number(2, 3).number(3, 3))
+                                        .message(11, Payload().number(1, 3100).number(2, 5).number(3, 7))
+                                        .number(15, 1));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"dl_earfcn=3100 INT", "dl_bandwidth=LTE_BW_20M STRING",
+                                              "dl_rf_band=7 INT", "subs_id=1 INT"}));
+  EXPECT_EQ(rowGroups(), (std::vector<std::string>{"LTE/Component Carrier Info"}));
 }
 
 TEST_F(IceDeviceTest, WithoutElementsOneRowIsWritten) {

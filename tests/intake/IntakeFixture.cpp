@@ -7,6 +7,7 @@ namespace quorl::test {
 void RecordingStore::insertMetric(Metric metric, WriteCompletion completion) {
   rows.push_back(std::move(metric));
   waiting_.push_back(std::move(completion));
+  onInsert();
 }
 
 void RecordingStore::fetchMetricContents(std::string_view /*metricTech*/, std::string_view /*metricName*/,

@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <deque>
+#include <functional>
 #include <initializer_list>
 #include <memory>
 #include <optional>
@@ -36,6 +37,8 @@ class RecordingStore final : public RowsOnlyStore {
   void completesAll();
 
   std::vector<Metric> rows;
+  /// Called after each insert.
+  std::function<void()> onInsert = [] {};
 
  private:
   std::deque<WriteCompletion> waiting_;
@@ -64,8 +67,9 @@ class IntakeTest : public ::testing::Test {
  protected:
   ~IntakeTest() override;
 
-  void deviceIsIce() { host.properties.texts["BasebandChipset"] = "ice7"; }
-  void deviceIsMav() { host.properties.texts["BasebandChipset"] = "mav20"; }
+  void deviceIs(std::string chipset) { host.properties.texts["BasebandChipset"] = std::move(chipset); }
+  void deviceIsIce() { deviceIs("ice7"); }
+  void deviceIsMav() { deviceIs("mav20"); }
   /// Makes the service. Lines of its construction are left out of `log`.
   void serviceStarts();
 

@@ -211,6 +211,32 @@ TEST_F(MetricRowsTest, ASubMessageInsideASubMessageIsWrittenWhole) {
   EXPECT_EQ(endsOfWalk(), 2U);
 }
 
+TEST_F(MetricRowsTest, TheWalkFlattensNoSubMessage) {
+  isWritten(dictionaryOf({{"subs_id", 1}, {"s", dictionaryOf({{"tx_band", 41}})}}));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"subs_id=1 INT", "tx_band=41 INT", "subs_id=1 INT"}));
+  store.rows.clear();
+  isWritten(dictionaryOf(
+      {{"subs_id", 1}, {"outer", dictionaryOf({{"name", textOf("n")}, {"inner", dictionaryOf({{"value", 1}})}})}}));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"subs_id=1 INT", "name=n STRING", "subs_id=1 INT", "value=1 INT",
+                                              "subs_id=1 INT"}));
+}
+
+TEST_F(MetricRowsTest, AnElementsOwnSubscriptionIdIsOverwritten) {
+  isWritten(dictionaryOf({{"subs_id", 1}, {"cells", listOf({dictionaryOf({{"subs_id", 0}, {"pci", 101}})})}}));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"subs_id=1 INT", "subs_id=1 INT", "pci=101 INT"}));
+  for (const Metric& row : store.rows) EXPECT_EQ(row.subsId, 1);
+}
+
+TEST_F(MetricRowsTest, AnElementWhoseWalkEndsEarlyCostsTheNextOneNothing) {
+  isWritten(dictionaryOf({{"subs_id", 1},
+                          {"cells", listOf({dictionaryOf({{"pci", 101}, {"state", textOf("")}}),
+                                            dictionaryOf({{"pci", 102}, {"beams", numbersOf({})}}),
+                                            dictionaryOf({{"pci", 103}, {"state", textOf("IDLE")}})})}}));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"subs_id=1 INT", "pci=101 INT", "subs_id=1 INT", "pci=102 INT",
+                                              "subs_id=1 INT", "pci=103 INT", "state=IDLE STRING", "subs_id=1 INT"}));
+  EXPECT_EQ(endsOfWalk(), 3U);
+}
+
 TEST_F(MetricRowsTest, EmptyListsAndTextsEndTheWalkWithoutARow) {
   for (const MetricValue& value : {numbersOf({}), listOf({}), textOf("")}) {
     store.rows.clear();
@@ -329,6 +355,37 @@ TEST_F(MetricRowsTest, TheTunerEventFlattensTheStateOfIntegersAndNotTheOtherOne)
   EXPECT_EQ(written[5], "tx_band=41 INT");
   EXPECT_EQ(written[6], "subs_id=1 INT");
   EXPECT_EQ(endsOfWalk(), 1U);
+}
+
+TEST_F(MetricRowsTest, AListInTheElementsOfAListWritesItsRowsBehindThoseOfItsElement) {
+  const auto bearer = [](std::uint64_t id) { return Payload().number(1, id); };
+  metricArrives(806919, Payload()
+                            .number(1, 1700000000123)
+                            .number(3, 9)
+                            .message(6, Payload().number(1, 1).message(3, bearer(1)).message(3, bearer(2)))
+                            .message(6, Payload().number(2, 2).message(3, bearer(3)))
+                            .number(15, 1));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"timestamp=1700000000123 INT", "reason=9 INT", "subs_id=1 INT",  //
+                                              "integrity_algo=ALGO_SNOW3G STRING", "subs_id=1 INT",            //
+                                              "drb_id=1 INT", "subs_id=1 INT", "drb_id=2 INT", "subs_id=1 INT",
+                                              "ciphering_algo=ALGO_AES STRING", "subs_id=1 INT",  //
+                                              "drb_id=3 INT", "subs_id=1 INT"}));
+  EXPECT_EQ(endsOfWalk(), 3U) << "the message's, and that of each element";
+}
+
+TEST_F(MetricRowsTest, AListInASubMessageWritesItsRowsBehindThoseOfTheSubMessage) {
+  const auto neighbor = [](std::uint64_t uarfcn) { return Payload().number(1, uarfcn).signedNumber(2, -115); };
+  metricArrives(3986190,
+                Payload()
+                    .number(13, 4)
+                    .message(27, Payload().number(1, 2).message(4, neighbor(10700)).message(4, neighbor(10725)))
+                    .message(28, Payload().number(1, 3).message(4, Payload().number(1, 62)))  // its turn does not come
+                    .number(127, 1));
+  EXPECT_EQ(rows(), (std::vector<std::string>{"Q_hyst=4 INT", "subs_id=1 INT",         //
+                                              "t_reselection=2 INT", "subs_id=1 INT",  //
+                                              "uarfcn=10700 INT", "q_rxlev_min=-115 INT", "subs_id=1 INT",
+                                              "uarfcn=10725 INT", "q_rxlev_min=-115 INT", "subs_id=1 INT"}));
+  EXPECT_EQ(endsOfWalk(), 2U);
 }
 
 }  // namespace

@@ -157,6 +157,18 @@ TEST_F(MetricServiceTest, WithoutTimestampTheTimeOfProcessingIsTaken) {
   EXPECT_EQ(store.rows[0].collectedOn, Date(1767605412987ms));
 }
 
+TEST_F(MetricServiceTest, AllRowsOfAMetricHaveOneTimeThoughTheClockGoesOn) {
+  serviceStarts();
+  const Date arrival = host.time.now();
+  store.onInsert = [this] { host.time.setNow(host.time.now() + 1s); };
+  metricArrives(806919, Payload()  // with elements, and their elements in turn
+                            .number(3, 9)
+                            .message(6, Payload().number(1, 1).message(3, Payload().number(1, 5)))
+                            .number(15, 1));
+  ASSERT_EQ(store.rows.size(), 6U);
+  for (const Metric& row : store.rows) EXPECT_EQ(row.collectedOn, arrival) << row.attributeName;
+}
+
 TEST_F(MetricServiceTest, AMetricWithoutUsableIdIsDropped) {
   serviceStarts();
   KeyValueMessage noId;
@@ -217,16 +229,32 @@ TEST_F(MetricServiceTest, AnIdOnThreeRowsGivesThreeSetsOfRows) {
   EXPECT_EQ(rows(), thrice);
 }
 
-TEST_F(MetricServiceTest, AnIceMetricOnAnotherDeviceIsStoredAsDecoded) {
+TEST_F(MetricServiceTest, AnIceMetricOnAnyOtherDeviceIsStoredAsDecoded) {
+  for (const char* chipset : {"mav20", "other"}) {
+    resetSharedObjects();
+    deviceIs(chipset);
+    serviceStarts();
+    store.rows.clear();
+    metricArrives(kActiveBearers,
+                  Payload().number(1, 1700000000123).number(2, 1).message(3, Payload().number(1, 5)).number(15, 1));
+    EXPECT_FALSE(log.has("MetricService - parseIceMetric - metricID 3CD50D")) << chipset;
+    const std::vector<std::string> written = rows();
+    ASSERT_EQ(written.size(), 3U * 5) << chipset;
+    EXPECT_EQ(std::vector<std::string>(written.begin(), written.begin() + 5),
+              (std::vector<std::string>{"timestamp=1700000000123 INT", "bearer_context_count=1 INT", "subs_id=1 INT",
+                                        "cid=5 INT", "subs_id=1 INT"}));
+  }
+}
+
+TEST_F(MetricServiceTest, ADeviceOfBothFamiliesAppliesTheIceRules) {
+  deviceIs("mav-ice");
   serviceStarts();
-  metricArrives(kActiveBearers,
-                Payload().number(1, 1700000000123).number(2, 1).message(3, Payload().number(1, 5)).number(15, 1));
-  EXPECT_FALSE(log.has("MetricService - parseIceMetric - metricID 3CD50D"));
+  metricArrives(kActiveBearers, Payload().number(1, 1700000000123).message(3, Payload().number(1, 5)).number(15, 1));
+  EXPECT_TRUE(log.has("MetricService - parseIceMetric - metricID 3CD50D"));
   const std::vector<std::string> written = rows();
-  ASSERT_EQ(written.size(), 3U * 5);
-  EXPECT_EQ(std::vector<std::string>(written.begin(), written.begin() + 5),
-            (std::vector<std::string>{"timestamp=1700000000123 INT", "bearer_context_count=1 INT", "subs_id=1 INT",
-                                      "cid=5 INT", "subs_id=1 INT"}));
+  ASSERT_EQ(written.size(), 3U * 2);
+  EXPECT_EQ(std::vector<std::string>(written.begin(), written.begin() + 2),
+            (std::vector<std::string>{"cid=5 INT", "subs_id=1 INT"}));
 }
 
 TEST_F(MetricServiceTest, ARowWithoutClassIsLoggedAndTheNextMetricIsHandled) {
