@@ -43,6 +43,23 @@ using Read = Outcome<std::vector<Metric>>;
 using Listed = Outcome<AvailableMetrics>;
 using Pinned = Outcome<std::vector<DashboardTableItem>>;
 
+/// A read that went well, whatever its rows.
+template <typename Result>
+void expectSuccess(const Outcome<Result>& outcome) {
+  EXPECT_EQ(outcome.calls, 1);
+  EXPECT_EQ(outcome.error, std::nullopt);
+  EXPECT_EQ(outcome.place, Place::main);
+}
+
+/// A read that failed and has no rows.
+template <typename Result>
+void expectFailure(const Outcome<Result>& outcome, const SQLiteError& error, Place place) {
+  EXPECT_EQ(outcome.calls, 1);
+  EXPECT_TRUE(outcome.result.empty());
+  EXPECT_EQ(outcome.error, error);
+  EXPECT_EQ(outcome.place, place);
+}
+
 inline SQLiteError prepareError(std::string message) {
   return {SQLiteError::Case::Prepare, std::move(message)};
 }
@@ -104,6 +121,26 @@ class DatabaseFixture : public testing::Test {
                         std::string_view collectedOn = "2026-01-05 09:00:00", std::int32_t subsId = 0) {
     return readingAt(parseWallClock(collectedOn).value(), "LTE", "Serving Cell Info", std::move(attribute),
                      std::move(value), subsId);
+  }
+
+  /// A row of `Metric` in which one column holds `value`, an SQL expression.
+  void insertRowWith(const std::string& column, const std::string& value) {
+    std::vector<std::pair<std::string, std::string>> row{{"metric_tech", "'LTE'"},
+                                                         {"metric_name", "'Serving Cell Info'"},
+                                                         {"attribute_name", "'dl_freq'"},
+                                                         {"attribute_value", "'5230'"},
+                                                         {"attribute_value_type", "'INT'"},
+                                                         {"is_attribute_graphable", "0"},
+                                                         {"metric_id", "'803010'"},
+                                                         {"subs_id", "0"},
+                                                         {"collected_on", "'2026-01-05 09:00:00'"}};
+    std::string columns;
+    std::string fields;
+    for (const auto& [name, expression] : row) {
+      columns += (columns.empty() ? "" : ", ") + name;
+      fields += (fields.empty() ? "" : ", ") + (name == column ? value : expression);
+    }
+    run("INSERT INTO Metric (" + columns + ") VALUES (" + fields + ")");
   }
 
   Written createTable(const std::string& sql, const std::string& name) {

@@ -23,42 +23,7 @@ using test::values;
 class StoreReadsTest : public test::DatabaseFixture {
  protected:
   void SetUp() override { openWithTables(); }
-
-  /// A row of `Metric` in which one column holds `value`, an SQL expression.
-  void insertRowWith(const std::string& column, const std::string& value) {
-    std::vector<std::pair<std::string, std::string>> row{{"metric_tech", "'LTE'"},
-                                                         {"metric_name", "'Serving Cell Info'"},
-                                                         {"attribute_name", "'dl_freq'"},
-                                                         {"attribute_value", "'5230'"},
-                                                         {"attribute_value_type", "'INT'"},
-                                                         {"is_attribute_graphable", "0"},
-                                                         {"metric_id", "'803010'"},
-                                                         {"subs_id", "0"},
-                                                         {"collected_on", "'2026-01-05 09:00:00'"}};
-    std::string columns;
-    std::string fields;
-    for (const auto& [name, expression] : row) {
-      columns += (columns.empty() ? "" : ", ") + name;
-      fields += (fields.empty() ? "" : ", ") + (name == column ? value : expression);
-    }
-    run("INSERT INTO Metric (" + columns + ") VALUES (" + fields + ")");
-  }
 };
-
-template <typename Result>
-void expectSuccess(const test::Outcome<Result>& outcome) {
-  EXPECT_EQ(outcome.calls, 1);
-  EXPECT_EQ(outcome.error, std::nullopt);
-  EXPECT_EQ(outcome.place, Place::main);
-}
-
-template <typename Result>
-void expectFailure(const test::Outcome<Result>& outcome, const SQLiteError& error, Place place) {
-  EXPECT_EQ(outcome.calls, 1);
-  EXPECT_TRUE(outcome.result.empty());
-  EXPECT_EQ(outcome.error, error);
-  EXPECT_EQ(outcome.place, place);
-}
 
 // What all reads share.
 
@@ -153,26 +118,6 @@ TEST_F(StoreReadsTest, ADateThatDoesNotParseEndsTheHistoryOnTheMainQueue) {
   expectFailure(history(kDaily), emptyQueryResult(), Place::main);
   expectFailure(history(kWeekly), emptyQueryResult(), Place::main);
   expectFailure(history(kMonthly), emptyQueryResult(), Place::main);
-}
-
-TEST_F(StoreReadsTest, AReadThatFailsInTheMiddleAnswersTheRowsThatItHas) {
-  for (int i = 0; i < 20; ++i) insert(reading("dl_freq", std::to_string(i)));
-  struct Budget {
-    int used = 0;
-    int limit = 1 << 30;
-  } budget;
-  const auto spend = [](void* context) {
-    auto* const spent = static_cast<Budget*>(context);
-    return ++spent->used > spent->limit ? 1 : 0;
-  };
-  sqlite3_progress_handler(database->dbPointer(), 1, spend, &budget);
-  ASSERT_EQ(exported(kDaily).result.size(), 20U);
-  budget = {0, budget.used / 2};
-  const Read interrupted = exported(kDaily);
-  sqlite3_progress_handler(database->dbPointer(), 0, nullptr, nullptr);
-  expectSuccess(interrupted);
-  EXPECT_GT(interrupted.result.size(), 0U);
-  EXPECT_LT(interrupted.result.size(), 20U);
 }
 
 TEST_F(StoreReadsTest, AnExportThatEndsOnABadRowDoesNotHoldTheJournal) {
