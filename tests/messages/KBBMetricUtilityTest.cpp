@@ -2,6 +2,7 @@
 #include <set>
 #include <string>
 #include <thread>
+#include <utility>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -87,12 +88,84 @@ TEST(KBBMetricUtilityTest, TextsWithoutClassNameNone) {
   }
 }
 
-TEST(KBBMetricUtilityTest, EntriesAreInTheirOrder) {
-  const auto entries = KBBMetricUtility::entries();
-  EXPECT_EQ(entries.front().text, "KCellularLteRrcState");
-  EXPECT_EQ(entries.front().metricId, 0x3C4E04U);
-  EXPECT_EQ(entries[31].text, "CellularLteScellInfo");
-  EXPECT_EQ(entries.back().text, "CellularNrRrcConnCount");
+TEST(KBBMetricUtilityTest, TheListIsThisAndInThisOrder) {
+  const std::vector<std::pair<std::uint32_t, std::string_view>> expected = {
+      {0x3C4E04, "KCellularLteRrcState"},
+      {0x3C4E18, "KCellularLteCdrxConfig"},
+      {0x3C4E25, "KCellularLteRadioLinkFailure"},
+      {0x3C40C2, "KCellularLteScellInfo"},
+      {0x3CD30E, "KCellularLteSelReselCellInfo"},
+      {0x3CD301, "KCellularLteServingCellMeasurement"},
+      {0x3CD302, "KCellularLteTxPower"},
+      {0x3C4F6A, "KCellularRsrpRsrqSinr"},
+      {0x3CD50C, "KCellularEmmContext"},
+      {0x3CD30B, "KCellularLteComponentCarrierInfo"},
+      {0x3CD313, "KCellularLteCarrierAggregationStatus"},
+      {0x3CD310, "KCellularLteNbrInterRatCellMeas"},
+      {0x3CD30F, "KCellularLteNbrEutraCellMeas"},
+      {0x3CD509, "KCellularMmCommonInfo"},
+      {0x3CD50D, "KCellularActivatedBearerContexts"},
+      {0x3CD112, "KCellularWcdmaRrcConnectionState"},
+      {0x3C300C, "KCellularWcdmaCellInfo"},
+      {0x3CD102, "KCellularWcdmaScellMeasurement"},
+      {0x3CD103, "KCellularWcdmaTxPower"},
+      {0x3CD105, "KCellularWcdmaNbrCellMeas"},
+      {0x3CD104, "KCellularWcdmaSelReselCellInfo"},
+      {0x3CD113, "KCellularWcdmaRrcConfiguration"},
+      {0x3CD50A, "KCellularMmContext"},
+      {0x3CD50B, "KCellularGmmContext"},
+      {0x3C2E0C, "kCellularGsmScellInfo"},
+      {0x3CD001, "kCellularGsmIdleConfig"},
+      {0x3CD002, "kCellularGsmIdleScellMeasurement"},
+      {0x3CD003, "kCellularGsmCsRfMeasurement"},
+      {0x3CD009, "kCellularGsmGrrEventMeasCr"},
+      {0x3CD00C, "kCellularGsmGprsConfig"},
+      {0x3C0013, "kCellularSimCardFiles"},
+      {0xC40C2, "CellularLteScellInfo"},
+      {0xC40C3, "CellularLteOtaMsg"},
+      {0xC5000, "CellularNrSysInfoBlocks"},
+      {0xC5001, "CellularNrOtaMsg"},
+      {0xC5002, "CellularNrScellInfo"},
+      {0xC5003, "CellularNrRachAttempt"},
+      {0xC5005, "CellularNrRrcState"},
+      {0xC5007, "CellularNrScgAddition"},
+      {0xC5008, "CellularNrScgRemoval"},
+      {0xC500A, "CellularNrBeamSwitch"},
+      {0xC5010, "CellularNrRrcResume"},
+      {0xC5014, "CellularNrUlPdcpStats"},
+      {0xC5015, "CellularNrEndcUsageStats"},
+      {0xC5016, "CellularNrConnectionStats"},
+      {0xC4F57, "CellularLTEConnectionStats"},
+      {0xC5018, "CellularNrSDMActivation"},
+      {0xC5019, "CellularNrSdmEndcRelease"},
+      {0xCA108, "CellularLqmStateChange"},
+      {0xCA104, "CellularRegAttempt"},
+      {0xCA102, "CellularRegisteredPlmnStatus"},
+      {0xCA163, "CellularRatLacSrvInfo"},
+      {0xC7407, "CellularHealthMonitor"},
+      {0xCC226, "CellularVoiceCallEvent"},
+      {0xC7505, "CellularRfTunerEvent"},
+      {0xCC006, "CellularCallEndDetails"},
+      {0xCC007, "CellularCsCallPageRespFail"},
+      {0xCC008, "CellularCsCallGwlPageRespFail"},
+      {0xC5013, "CellularNrRadioLinkFailure"},
+      {0xCA123, "CellularLqmDataStall"},
+      {0xC1002, "CellularCdmaCellInfo"},
+      {0xC300C, "CellularGsmWcdmaCellInfo"},
+      {0xC3E02, "CellularWcdmaRrcState"},
+      {0xC3E0B, "Cellular WcdmaRachattempt"},
+      {0xC4F04, "CellularLteRsrpRsrqSinrHist"},
+      {0xC4F12, "CellularLteRrcStateHist"},
+      {0xC4120, "CellularLteRachAttempt"},
+      {0xCA100, "CellularServiceStatus"},
+      {0xCA101, "CellularSysOprtMode"},
+      {0xCA103, "CellularSimHplmn"},
+      {0xCA162, "CellularRatLacSrvInfo"},
+      {0xC5004, "CellularNrRrcConnCount"},
+  };
+  std::vector<std::pair<std::uint32_t, std::string_view>> entries;
+  for (const auto& entry : KBBMetricUtility::entries()) entries.emplace_back(entry.metricId, entry.text);
+  EXPECT_EQ(entries, expected);
 }
 
 TEST(KBBMetricUtilityTest, ConcurrentQueriesAgree) {

@@ -7,6 +7,7 @@
 #include "messages/classes/lte_carrier_aggregation.h"
 #include "messages/classes/lte_rrc.h"
 #include "messages/classes/nas_context.h"
+#include "messages/classes/wcdma_connection.h"
 #include "messages/classes/wcdma_statistics.h"
 
 namespace quorl {
@@ -53,6 +54,14 @@ TEST(MessageDictionaryTest, EnumerationIsItsNameOrTellsThatItIsUnknown) {
   const auto dictionary = *context.dictionaryRepresentation();
   EXPECT_EQ(value<Text>(dictionary, "reg_status"), "KREG_STATUS_SUSPENDED");
   EXPECT_EQ(value<Text>(dictionary, "reject_cause"), "(unknown: 1)");
+}
+
+TEST(MessageDictionaryTest, AUmtsHistoryNamesItsStatesAsLteDoesAsMeant) {
+  CellularUmtsRrcStateHist history;
+  auto state = makeMessageRef<StateHist>();
+  state->setRrcState(4);
+  history.addStateHist(state);
+  EXPECT_EQ(test::dictionaryText(history), "[state_hist: [[rrc_state: LTE_RRC_CONNECTED]]]");
 }
 
 TEST(MessageDictionaryTest, ByteStringAndTextAreTheirOwnContent) {

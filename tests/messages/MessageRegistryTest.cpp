@@ -1,4 +1,5 @@
 #include <algorithm>
+#include <map>
 #include <set>
 #include <string>
 
@@ -161,6 +162,20 @@ TEST(MessageRegistryTest, SharedKeysHaveOneKindInEveryClass) {
       }
     }
   }
+}
+
+TEST(MessageRegistryTest, TheSubscriptionOfTheIceLteMessagesHasOneTagInAllButThree) {
+  std::map<std::string_view, std::uint32_t> others;
+  for (const MessageTable* table : allMessageTables()) {
+    if (!table->className.starts_with("KCellularLte")) continue;
+    const auto field = std::find_if(table->fields.begin(), table->fields.end(),
+                                    [](const FieldEntry& candidate) { return candidate.key == "subs_id"; });
+    ASSERT_NE(field, table->fields.end()) << table->className;
+    if (field->tag != 15) others[table->className] = field->tag;
+  }
+  EXPECT_EQ(others, (std::map<std::string_view, std::uint32_t>{{"KCellularLteRsrpRsrqSinr", 2},
+                                                               {"KCellularLteScellInfo", 127},
+                                                               {"KCellularLteSelReselCellInfo", 127}}));
 }
 
 }  // namespace
