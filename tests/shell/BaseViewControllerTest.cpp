@@ -236,6 +236,7 @@ TEST_F(BaseViewControllerTest, TheEndOfTheNavigationIsAnErrorInTheLog) {
     phone_.time.settle();
   }
   EXPECT_EQ(log.count("root navigation vc deinit called"), 1);
+  EXPECT_TRUE(log.has({"app-ui", LogLevel::Error, "root navigation vc deinit called"}));
 }
 
 }  // namespace
