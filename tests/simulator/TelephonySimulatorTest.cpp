@@ -271,12 +271,14 @@ TEST_F(TelephonySimulatorTest, ScriptHappensAtItsTimesAndItsBeginningAtOnce) {
   EXPECT_THAT(listener->told, ElementsAre("slot 1 SIM no cell", "slot 2 SIM no cell", "slot 1 no SIM no cell"));
 }
 
-TEST_F(TelephonySimulatorTest, StepsToComeAreDroppedWithTheSimulator) {
-  phone->play({{100ms, event::SimInserted{1, std::nullopt}}}, *main);
-  client.reset();  // keeps the simulated phone alive otherwise
+TEST_F(TelephonySimulatorTest, StepsToComeAreDroppedWithTheSimulatorThoughItsClientLivesOn) {
+  phone->play({{0ms, event::SimInserted{2, std::nullopt}}, {100ms, event::SimInserted{1, std::nullopt}}}, *main);
+  time.settle();
+  listener->told.clear();
   phone.reset();
   time.advance(1s);
   EXPECT_THAT(listener->told, IsEmpty());
+  EXPECT_THAT(subscriptions(), ElementsAre(Pair(1, false), Pair(2, true)));
 }
 
 TEST_F(TelephonySimulatorTest, ShippedScriptRunsToItsEnd) {

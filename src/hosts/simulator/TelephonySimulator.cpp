@@ -101,6 +101,7 @@ struct TelephonySimulator::State {
   bool hasCarrierMap = true;
   std::optional<HVError> subscriptionsError;
   std::vector<std::weak_ptr<ClientCore>> clients;
+  bool isPhoneGone = false;  // while clients live on
 };
 
 void TelephonySimulator::State::perform(const telephony_event::Event& event) {
@@ -250,7 +251,10 @@ class TelephonySimulator::NetworkInfo final : public HVTelephonyNetworkInfo {
 TelephonySimulator::TelephonySimulator(QueueFactory& queues)
     : state_(std::make_shared<State>(queues.makeSerialQueue("simulated telephony"))) {}
 
-TelephonySimulator::~TelephonySimulator() = default;
+TelephonySimulator::~TelephonySimulator() {
+  const std::lock_guard lock(state_->mutex);
+  state_->isPhoneGone = true;
+}
 
 std::unique_ptr<HorvaneClient> TelephonySimulator::initWithQueue(Queue& queue) {
   auto core = std::make_shared<ClientCore>(queue);
@@ -285,6 +289,7 @@ void TelephonySimulator::play(std::vector<TelephonyScriptStep> steps, Queue& que
       const auto state = weak.lock();
       if (!state) return;
       const std::lock_guard lock(state->mutex);
+      if (state->isPhoneGone) return;
       for (const telephony_event::Event& event : events) state->perform(event);
     });
   }

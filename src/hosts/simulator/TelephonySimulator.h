@@ -26,7 +26,8 @@ class TelephonySimulator final : public HorvaneClientFactory {
  public:
   /// Two empty slots, and nothing fails.
   explicit TelephonySimulator(QueueFactory& queues);
-  /// Delivers the answers that wait on the worker queue.
+  /// Drops the steps still to come; clients that live on answer with what was so at the end. The answers that wait on
+  /// the worker queue are delivered, by the end of the last client at the latest.
   ~TelephonySimulator() override;
   TelephonySimulator(const TelephonySimulator&) = delete;
   TelephonySimulator& operator=(const TelephonySimulator&) = delete;
@@ -41,7 +42,7 @@ class TelephonySimulator final : public HorvaneClientFactory {
   void perform(const telephony_event::Event& event);
   /// Performs the steps of time 0 inside the call, so that whoever starts afterwards finds the phone so, and the later
   /// ones on `queue`, each at its time counted from now; steps of one time in their order. Steps still to come are
-  /// dropped when the simulator goes away. `queue` must outlive it.
+  /// dropped when the simulator goes away, whoever of its clients lives on. `queue` must outlive it.
   void play(std::vector<TelephonyScriptStep> steps, Queue& queue);
 
  private:
