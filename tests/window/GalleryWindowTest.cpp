@@ -1,5 +1,7 @@
 #include <QAbstractItemModelTester>
+#include <QPointF>
 #include <QQmlComponent>
+#include <QSignalSpy>
 #include <QTest>
 #include <chrono>
 #include <memory>
@@ -9,7 +11,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "shell/CircularTransition.h"
 #include "shell/TickerViewController.h"
+#include "shell/view/CircularTransitionBinding.h"
 #include "shell/view/TickerColumnsModel.h"
 #include "support/window/WindowFixture.h"
 #include "telephony/HorvaneMetricDetails.h"
@@ -155,6 +159,139 @@ TEST_F(GalleryWindowTest, TheWaitingStateSaysSo) {
   EXPECT_EQ(text("spinningText"), "Loading...");
   EXPECT_EQ(text("toastText"), "copied");
   EXPECT_EQ(find("loadingLabel")->x() - (find("loading")->childItems().constFirst()->width()), 5);
+}
+
+constexpr char kTransitionPage[] = R"(
+import QtQuick
+import Quorl
+
+Item {
+    id: page
+
+    required property CircularTransitionBinding binding
+
+    anchors.fill: parent
+
+    Rectangle {
+        id: moving
+
+        objectName: "moving"
+        width: page.width
+        height: page.height
+    }
+    CircularTransition {
+        objectName: "transition"
+        anchors.fill: parent
+        binding: page.binding
+        view: moving
+    }
+})";
+
+/// A view that comes and goes in a circle around a point of the window.
+class CircularTransitionWindowTest : public test::WindowTest {
+ protected:
+  void opens() {
+    launch();
+    transition_.setStartingPoint({kOrigin.x(), kOrigin.y()});
+    transition_.setCircleColor("ButtonSelected");
+    QQmlComponent page(&engine());
+    page.setData(kTransitionPage, {});
+    ASSERT_TRUE(page.isReady()) << page.errorString().toStdString();
+    page_.reset(qobject_cast<QQuickItem*>(page.createWithInitialProperties(
+        {{"parent", QVariant::fromValue(window().contentItem())}, {"binding", QVariant::fromValue(&binding_)}})));
+    ASSERT_NE(page_, nullptr);
+    view_ = page_->findChild<QQuickItem*>("moving");
+    circle_ = page_->findChild<QQuickItem*>("transitionCircle");
+    ends_ = std::make_unique<QSignalSpy>(page_->findChild<QQuickItem*>("transition"), SIGNAL(finished()));
+    grab();
+    middle_ = {page_->width() / 2, page_->height() / 2};
+  }
+  void TearDown() override {
+    ends_.reset();
+    page_.reset();
+    WindowTest::TearDown();
+  }
+  void runs(view::CircularTransitionBinding::Mode mode) {
+    QMetaObject::invokeMethod(page_->findChild<QQuickItem*>("transition"), "run", Q_ARG(QVariant, mode));
+  }
+
+  static void expectCentre(const QQuickItem* item, QPointF point) {
+    const QPointF centre = item->mapToScene(QPointF(item->width() / 2, item->height() / 2));
+    EXPECT_NEAR(centre.x(), point.x(), 0.01);
+    EXPECT_NEAR(centre.y(), point.y(), 0.01);
+  }
+  void expectSmallestAtItsOrigin() {
+    EXPECT_DOUBLE_EQ(view_->scale(), 0.001);
+    EXPECT_DOUBLE_EQ(circle_->scale(), 0.001);
+    EXPECT_EQ(view_->opacity(), 0);
+    expectCentre(view_, kOrigin);
+    expectCentre(circle_, kOrigin);
+  }
+  void expectWholeInItsPlace() {
+    EXPECT_EQ(view_->scale(), 1);
+    EXPECT_EQ(circle_->scale(), 1);
+    EXPECT_EQ(view_->opacity(), 1);
+    expectCentre(view_, middle_);
+    expectCentre(circle_, kOrigin);
+  }
+  void expectHalfWay() {
+    const double progress = view_->opacity();
+    EXPECT_NEAR(progress, 0.5, 0.2);
+    EXPECT_NEAR(view_->scale(), progress, 0.01);
+    EXPECT_EQ(circle_->scale(), view_->scale());
+    expectCentre(view_, kOrigin + (middle_ - kOrigin) * progress);
+    expectCentre(circle_, kOrigin);
+  }
+
+  static constexpr QPointF kOrigin{60, 700};
+  CircularTransition transition_;
+  view::CircularTransitionBinding binding_{transition_};
+  std::unique_ptr<QQuickItem> page_;
+  std::unique_ptr<QSignalSpy> ends_;
+  QQuickItem* view_ = nullptr;
+  QQuickItem* circle_ = nullptr;
+  QPointF middle_;
+};
+
+TEST_F(CircularTransitionWindowTest, AViewThatIsPresentedGrowsOutOfThePointIntoItsPlace) {
+  opens();
+  runs(view::CircularTransitionBinding::Present);
+  expectSmallestAtItsOrigin();
+  pass(150ms);
+  expectHalfWay();
+  EXPECT_EQ(ends_->count(), 0);
+  pass(200ms);
+  expectWholeInItsPlace();
+  EXPECT_EQ(ends_->count(), 1);
+  EXPECT_EQ(transition_.transitionMode(), CircularTransitionMode::present);
+}
+
+TEST_F(CircularTransitionWindowTest, AViewThatIsDismissedShrinksIntoThePoint) {
+  opens();
+  runs(view::CircularTransitionBinding::Present);
+  pass(400ms);
+  runs(view::CircularTransitionBinding::Dismiss);
+  expectWholeInItsPlace();
+  pass(150ms);
+  expectHalfWay();
+  EXPECT_EQ(ends_->count(), 1);
+  pass(200ms);
+  expectSmallestAtItsOrigin();
+  EXPECT_EQ(ends_->count(), 2);
+  EXPECT_EQ(transition_.transitionMode(), CircularTransitionMode::dismiss);
+}
+
+TEST_F(CircularTransitionWindowTest, APopShrinksTheViewThatComesLikeOneThatGoesAsMeant) {
+  opens();
+  runs(view::CircularTransitionBinding::Pop);  // nothing was presented before
+  expectWholeInItsPlace();
+  pass(150ms);
+  expectHalfWay();
+  EXPECT_EQ(ends_->count(), 0);
+  pass(200ms);
+  expectSmallestAtItsOrigin();
+  EXPECT_EQ(ends_->count(), 1);
+  EXPECT_EQ(transition_.transitionMode(), CircularTransitionMode::pop);
 }
 
 }  // namespace
