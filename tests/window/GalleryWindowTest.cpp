@@ -1,4 +1,5 @@
 #include <QAbstractItemModelTester>
+#include <QColor>
 #include <QPointF>
 #include <QQmlComponent>
 #include <QSignalSpy>
@@ -193,7 +194,6 @@ class CircularTransitionWindowTest : public test::WindowTest {
   void opens() {
     launch();
     transition_.setStartingPoint({kOrigin.x(), kOrigin.y()});
-    transition_.setCircleColor("ButtonSelected");
     QQmlComponent page(&engine());
     page.setData(kTransitionPage, {});
     ASSERT_TRUE(page.isReady()) << page.errorString().toStdString();
@@ -252,6 +252,17 @@ class CircularTransitionWindowTest : public test::WindowTest {
   QQuickItem* circle_ = nullptr;
   QPointF middle_;
 };
+
+TEST_F(CircularTransitionWindowTest, TheCircleIsWhiteUnlessAColourIsNamed) {
+  opens();
+  EXPECT_EQ(circle_->property("color").value<QColor>(), QColor("white"));
+}
+
+TEST_F(CircularTransitionWindowTest, TheCircleHasTheColourOfThatName) {
+  transition_.setCircleColor("ButtonSelected");
+  opens();
+  EXPECT_EQ(circle_->property("color").value<QColor>(), QColor("#B63C0B"));
+}
 
 TEST_F(CircularTransitionWindowTest, AViewThatIsPresentedGrowsOutOfThePointIntoItsPlace) {
   opens();

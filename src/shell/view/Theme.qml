@@ -42,10 +42,10 @@ QtObject {
 
     readonly property bool reducedMotion: Appearance.reducedMotion
 
-    // The named colour, as "ButtonSelected".
+    // The named colour, as "ButtonSelected", or one that the toolkit knows, as "white".
     function color(name: string): color {
         return { Background: background, Title: title, Content: content, Header: header, ButtonNormal: buttonNormal,
-                 ButtonSelected: buttonSelected, SubtitleNumbers: subtitleNumbers }[name]
+                 ButtonSelected: buttonSelected, SubtitleNumbers: subtitleNumbers }[name] ?? name
     }
 
     // `ms` milliseconds, or none where the system asks for less motion.
