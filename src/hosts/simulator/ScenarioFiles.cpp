@@ -28,6 +28,10 @@ fs::path fileOf(std::string_view name, const std::vector<fs::path>& resources) {
   return {};
 }
 
+bool isPath(std::string_view nameOrPath) {
+  return nameOrPath.find('/') != std::string_view::npos || nameOrPath.ends_with(kEnding);
+}
+
 }  // namespace
 
 std::vector<std::string> scenarioNames(const std::vector<fs::path>& resources) {
@@ -40,10 +44,13 @@ std::vector<std::string> scenarioNames(const std::vector<fs::path>& resources) {
   return {names.begin(), names.end()};
 }
 
+bool isScenario(std::string_view nameOrPath, const std::vector<fs::path>& resources) {
+  return isPath(nameOrPath) || !fileOf(nameOrPath, resources).empty();
+}
+
 tl::expected<network::Scenario, std::vector<std::string>> findScenario(std::string_view nameOrPath,
                                                                        const std::vector<fs::path>& resources) {
-  const bool isPath = nameOrPath.find('/') != std::string_view::npos || nameOrPath.ends_with(kEnding);
-  const fs::path file = isPath ? fs::path(nameOrPath) : fileOf(nameOrPath, resources);
+  const fs::path file = isPath(nameOrPath) ? fs::path(nameOrPath) : fileOf(nameOrPath, resources);
   if (file.empty()) {
     const std::vector<std::string> known = scenarioNames(resources);
     return tl::unexpected(std::vector{

@@ -1,4 +1,5 @@
 #include <filesystem>
+#include <fstream>
 #include <sstream>
 #include <string>
 #include <utility>
@@ -10,12 +11,15 @@
 
 #include "hosts/simulator/ScenarioFiles.h"
 #include "simulator/network/TestScenarios.h"
+#include "support/TemporaryDirectory.h"
 
 namespace quorl::simulator::network {
 namespace {
 
 using ::testing::ElementsAre;
 using ::testing::ElementsAreArray;
+using ::testing::IsEmpty;
+using ::testing::SizeIs;
 
 constexpr const char* kSmall = R"(
 about "One site"
@@ -148,13 +152,12 @@ TEST(ScenarioReadingTest, ABadLineIsNamedByItsNumber) {
 }
 
 TEST(ScenarioReadingTest, WhatTheWholeLacksIsToldOnceTheLinesAreRight) {
-  EXPECT_THAT(problems("# nothing\n"),
-              ElementsAre("test.scenario:0: no network", "test.scenario:0: no site",
-                          "test.scenario:0: no point of the route", "test.scenario:0: no sim"));
+  EXPECT_THAT(problems("# nothing\n"), ElementsAre("test.scenario: no network", "test.scenario: no site",
+                                                   "test.scenario: no point of the route", "test.scenario: no sim"));
   EXPECT_THAT(problems(std::string(kSmall) + "at 1:00 call in slot=2\n"),
-              ElementsAre("test.scenario:0: the script uses slot 2, which has no sim"));
+              ElementsAre("test.scenario: the script uses slot 2, which has no sim"));
   EXPECT_THAT(problems(std::string(kSmall) + "route loop\npoint 5 5 speed=10\n"),
-              ElementsAre("test.scenario:0: a loop needs a speed at its first point, for the way back"));
+              ElementsAre("test.scenario: a loop needs a speed at its first point, for the way back"));
   EXPECT_THAT(problems("load much\n"), ElementsAre("test.scenario:1: load is no number: much"));
 }
 
@@ -169,10 +172,27 @@ TEST(ScenarioReadingTest, ManyBadLinesEndTheReading) {
   EXPECT_EQ(problems(text).size(), 100U);
 }
 
-TEST(ScenarioReadingTest, AFileThatIsNotThereIsAProblemOfLine0) {
+TEST(ScenarioReadingTest, AFileThatIsNotThereIsAProblemOfTheWhole) {
   const auto reading = readScenario(std::filesystem::path("/nowhere/at-all.scenario"));
   ASSERT_EQ(reading.problems.size(), 1U);
-  EXPECT_EQ(logText(reading.problems[0]), "at-all.scenario:0: cannot be opened: No such file or directory");
+  EXPECT_EQ(logText(reading.problems[0]), "/nowhere/at-all.scenario: cannot be opened: No such file or directory");
+}
+
+TEST(ScenarioReadingTest, ProblemsOfAFileHaveItsPathAsGiven) {
+  const test::TemporaryDirectory directory;
+  const auto file = directory.path() / "wrong.scenario";
+  std::ofstream(file) << "load much\n";
+  EXPECT_EQ(logText(readScenario(file).problems.at(0)), file.string() + ":1: load is no number: much");
+  const std::filesystem::path folder = directory.path().string() + "/";
+  EXPECT_EQ(logText(readScenario(folder).problems.at(0)), folder.string() + ": is a directory");
+}
+
+TEST(ScenarioReadingTest, AByteOrderMarkStandsForNothing) {
+  EXPECT_THAT(problems("\xEF\xBB\xBF" + std::string(kSmall)), IsEmpty());
+  EXPECT_THAT(problems("\xEF\xBB\xBF"
+                       "load much\n"),
+              ElementsAre("test.scenario:1: load is no number: much"));
+  EXPECT_THAT(problems(std::string(kSmall) + "\xEF\xBB\xBF\n"), SizeIs(1)) << "only at the beginning";
 }
 
 }  // namespace

@@ -20,6 +20,7 @@ namespace {
 constexpr double kFarthest = 1e6;  // metres
 constexpr std::size_t kMostCells = 5000;
 constexpr std::size_t kMostProblems = 100;
+constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
 
 template <typename Value, std::size_t Count>
 Value oneOf(const std::string& word, std::string_view what,
@@ -316,6 +317,7 @@ class Builder {
 }  // namespace
 
 std::string logText(const ScenarioProblem& problem) {
+  if (problem.line == 0) return fmt::format("{}: {}", problem.file, problem.reason);
   return fmt::format("{}:{}: {}", problem.file, problem.line, problem.reason);
 }
 
@@ -329,6 +331,7 @@ ScenarioReading readScenario(std::istream& input, std::string_view name) {
   std::size_t number = 0;
   for (std::string text; reading.problems.size() < kMostProblems && std::getline(input, text);) {
     ++number;
+    if (number == 1 && text.starts_with(kByteOrderMark)) text.erase(0, kByteOrderMark.size());
     try {
       ScenarioLine line(text);
       if (!line.isEmpty()) builder.take(std::move(line));
@@ -344,14 +347,18 @@ ScenarioReading readScenario(std::istream& input, std::string_view name) {
 }
 
 ScenarioReading readScenario(const std::filesystem::path& file) {
-  const std::string name = file.filename().string();
+  ScenarioReading reading;
+  const auto unreadable = [&](std::string reason) {
+    reading.problems.push_back({file.string(), 0, std::move(reason)});
+    return std::move(reading);
+  };
+  std::error_code ignored;
+  if (std::filesystem::is_directory(file, ignored)) return unreadable("is a directory");
   std::ifstream input(file, std::ios::binary);
-  if (!input) {
-    ScenarioReading reading;
-    reading.problems.push_back({name, 0, "cannot be opened: " + std::generic_category().message(errno)});
-    return reading;
-  }
-  return readScenario(input, name);
+  if (!input) return unreadable("cannot be opened: " + std::generic_category().message(errno));
+  reading = readScenario(input, file.filename().string());
+  for (ScenarioProblem& problem : reading.problems) problem.file = file.string();
+  return reading;
 }
 
 }  // namespace quorl::simulator::network

@@ -20,7 +20,7 @@ struct ScenarioProblem {
   std::string reason;
 };
 
-/// "city.scenario:3: no layer of that name: b33".
+/// "city.scenario:3: no layer of that name: b33", or "city.scenario: no sim" for the file as a whole.
 std::string logText(const ScenarioProblem& problem);
 
 struct ScenarioReading {
@@ -30,7 +30,7 @@ struct ScenarioReading {
 
 /// Reads a scenario; `name` is for the problems. Never throws.
 ScenarioReading readScenario(std::istream& input, std::string_view name);
-/// The same from a file.
+/// The same from a file; the problems have its path as given.
 ScenarioReading readScenario(const std::filesystem::path& file);
 
 }  // namespace quorl::simulator::network
