@@ -12,7 +12,7 @@ inline constexpr int kSuccess = 0;
 inline constexpr int kFailure = 1;   // something could not be done, or not for all of the input
 inline constexpr int kWrongUse = 2;  // nothing was tried
 
-/// Tells the user what is wrong: one line on standard error.
+/// Tells the user what is wrong: one line on standard error, without control characters.
 void complain(std::string_view text);
 
 void addDecode(CommandLine& tool);

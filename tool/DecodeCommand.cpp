@@ -1,3 +1,4 @@
+#include <cstddef>
 #include <iostream>
 #include <memory>
 #include <optional>
@@ -7,6 +8,7 @@
 
 #include "Commands.h"
 #include "Hexadecimal.h"
+#include "InputLines.h"
 #include "MessageClass.h"
 #include "MessageJson.h"
 
@@ -17,8 +19,7 @@ int decode(const std::string& className) {
   const MessageTable* table = messageClass(className);
   if (table == nullptr) return kWrongUse;
   int exitCode = kSuccess;
-  std::string line;
-  for (std::size_t number = 1; std::getline(std::cin, line); ++number) {
+  const bool isWhole = forEachInputLine([&](std::size_t number, const std::string& line) {
     std::optional<MetricDictionary> result;
     if (const auto payload = hexBytes(line)) {
       const std::unique_ptr<MetricCodable> message(table->make());
@@ -29,8 +30,8 @@ int decode(const std::string& className) {
       exitCode = kFailure;
     }
     std::cout << messageLine(result) << '\n';
-  }
-  return exitCode;
+  });
+  return isWhole ? exitCode : kFailure;
 }
 
 }  // namespace

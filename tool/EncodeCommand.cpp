@@ -1,3 +1,4 @@
+#include <cstddef>
 #include <iostream>
 #include <memory>
 #include <string>
@@ -6,6 +7,7 @@
 
 #include "Commands.h"
 #include "Hexadecimal.h"
+#include "InputLines.h"
 #include "MessageClass.h"
 #include "MessageJson.h"
 #include "messages/wire/WireWriter.h"
@@ -25,16 +27,15 @@ int encode(const std::string& className) {
   const MessageTable* table = messageClass(className);
   if (table == nullptr) return kWrongUse;
   int exitCode = kSuccess;
-  std::string line;
-  for (std::size_t number = 1; std::getline(std::cin, line); ++number) {
+  const bool isWhole = forEachInputLine([&](std::size_t number, const std::string& line) {
     if (const auto payload = encodeLine(*table, line)) {
       std::cout << *payload << '\n';
     } else {
       complain(fmt::format("line {}: {}", number, payload.error()));
       exitCode = kFailure;
     }
-  }
-  return exitCode;
+  });
+  return isWhole ? exitCode : kFailure;
 }
 
 }  // namespace

@@ -14,6 +14,7 @@
 #include "TextTable.h"
 #include "TimeFrameOption.h"
 #include "base/DateText.h"
+#include "base/PrintableText.h"
 #include "screens/history/AttributeContentDetailsViewController.h"
 
 namespace quorl::tool {

@@ -39,6 +39,9 @@ struct JsonMember {
   JsonValue value;
 };
 
+/// JSON text with DEL and the C1 control characters, which JSON lets stand, as escapes: a terminal obeys them.
+std::string withEscapedControls(std::string json);
+
 /// An object with its members in this order, on one line without its line break. A member without a value is left out.
 std::string jsonLine(std::initializer_list<JsonMember> members);
 

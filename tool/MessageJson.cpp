@@ -14,6 +14,7 @@
 #include <nlohmann/json.hpp>
 
 #include "Hexadecimal.h"
+#include "JsonLine.h"
 #include "messages/MessageFields.h"
 #include "messages/MessageRef.h"
 #include "messages/MessageTable.h"
@@ -227,14 +228,36 @@ Outcome fillObject(MetricCodable& message, const Json& object, const std::string
   return {};
 }
 
+/// How deep arrays and objects are in each other; of text that is no JSON some number.
+std::size_t nesting(std::string_view json) {
+  std::size_t depth = 0;
+  std::size_t deepest = 0;
+  bool isInText = false;
+  for (std::size_t at = 0; at < json.size(); ++at) {
+    const char c = json[at];
+    if (isInText && c == '\\') {
+      ++at;
+    } else if (c == '"') {
+      isInText = !isInText;
+    } else if (!isInText && (c == '[' || c == '{')) {
+      deepest = std::max(deepest, ++depth);
+    } else if (!isInText && (c == ']' || c == '}') && depth > 0) {
+      --depth;
+    }
+  }
+  return deepest;
+}
+
 }  // namespace
 
 std::string messageLine(const std::optional<MetricDictionary>& dictionary) {
   const Json object = dictionary ? toJson(*dictionary) : Json();
-  return object.dump(-1, ' ', /*ensure_ascii=*/false, Json::error_handler_t::replace);
+  return withEscapedControls(object.dump(-1, ' ', /*ensure_ascii=*/false, Json::error_handler_t::replace));
 }
 
 tl::expected<void, std::string> fillFromJson(MetricCodable& message, std::string_view json) {
+  constexpr std::size_t kDeepest = 100;  // no message comes near; the JSON library writes by recursion
+  if (nesting(json) > kDeepest) return tl::unexpected(fmt::format("nested deeper than {}", kDeepest));
   const Json object = Json::parse(json, nullptr, /*allow_exceptions=*/false);
   if (object.is_discarded()) return tl::unexpected(std::string("not JSON"));
   return fillObject(message, object, "");

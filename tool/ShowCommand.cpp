@@ -9,6 +9,7 @@
 #include "StoreSession.h"
 #include "TextTable.h"
 #include "base/DateText.h"
+#include "base/PrintableText.h"
 #include "screens/metricdetail/MetricDetailsViewController.h"
 
 namespace quorl::tool {
@@ -24,7 +25,7 @@ void printTable(MetricDetailView& view) {
   std::cout << view.lastSeenText() << '\n';
   for (const MetricDetailView::Section& section : view.sections()) {
     std::cout << '\n';
-    if (!section.header.empty()) std::cout << section.header << '\n';
+    if (!section.header.empty()) std::cout << printable(section.header) << '\n';
     TextTable table({"Attribute", "Value", "Pinned", "Graph"});
     for (const auto& cell : section.cells)
       table.add({cell->nameText(), cell->valueText(), cell->isBookmarked() ? "yes" : "",

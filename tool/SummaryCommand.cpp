@@ -10,7 +10,7 @@
 #include "Commands.h"
 #include "Documents.h"
 #include "JsonLine.h"
-#include "TextTable.h"
+#include "base/PrintableText.h"
 
 namespace quorl::tool {
 namespace {

@@ -1,7 +1,8 @@
 #include "TextTable.h"
 
 #include <algorithm>
-#include <utility>
+
+#include "base/PrintableText.h"
 
 namespace quorl::tool {
 
@@ -10,16 +11,10 @@ std::size_t displayWidth(std::string_view text) {
       text.begin(), text.end(), [](char byte) { return (static_cast<unsigned char>(byte) & 0xC0) != 0x80; }));
 }
 
-std::string printable(std::string text) {
-  std::replace_if(
-      text.begin(), text.end(), [](char byte) { return (byte >= 0 && byte < ' ') || byte == 0x7F; }, '.');
-  return text;
-}
-
 void TextTable::add(std::vector<std::string> cells) {
   widths_.resize(std::max(widths_.size(), cells.size()));
   for (std::size_t column = 0; column < cells.size(); ++column) {
-    cells[column] = printable(std::move(cells[column]));
+    cells[column] = printable(cells[column]);
     widths_[column] = std::max(widths_[column], displayWidth(cells[column]));
   }
   rows_.push_back(std::move(cells));

@@ -12,7 +12,7 @@ class TextTable {
  public:
   explicit TextTable(std::vector<std::string> head) { add(std::move(head)); }
 
-  /// One cell for each column of the head.
+  /// One cell for each column of the head. Control characters become dots: stored texts come from outside.
   void add(std::vector<std::string> cells);
   void print(std::ostream& output) const;
 
@@ -23,8 +23,5 @@ class TextTable {
 
 /// How many columns of a terminal a UTF-8 text takes, a column for each character.
 std::size_t displayWidth(std::string_view text);
-
-/// `text` with a dot for each control character: stored texts come from outside, and a terminal obeys them.
-std::string printable(std::string text);
 
 }  // namespace quorl::tool

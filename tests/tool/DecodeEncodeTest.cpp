@@ -150,11 +150,38 @@ TEST(ToolEncode, LeavesOutABadLineAndGoesOn) {
   EXPECT_EQ(result.exitCode, 1);
 }
 
-TEST(ToolEncode, SurvivesDeepNestingAndLongTexts) {
-  EXPECT_EQ(encode("Guti", std::string(200000, '[') + "\n").exitCode, 1);
+TEST(ToolEncode, RefusesDeepNesting) {
+  const std::string deep = std::string(100000, '[') + std::string(100000, ']');
+  EXPECT_EQ(encodeFault(R"({"subs_id":)" + deep + "}"), "quorl-tool: line 1: nested deeper than 100\n");
+  EXPECT_EQ(encodeFault(std::string(200000, '[')), "quorl-tool: line 1: nested deeper than 100\n");
+  const std::string deepest = std::string(99, '[') + std::string(99, ']');
+  EXPECT_EQ(encodeFault(R"({"subs_id":)" + deepest + "}"),
+            "quorl-tool: line 1: subs_id: a whole number is wanted, not " + std::string(60, '[') + "...\n");
+  EXPECT_EQ(encode("BearerContext", R"({"apn":"\")" + std::string(200, '[') + "\"}\n").exitCode, 0)
+      << "brackets in a text are none";
+}
+
+TEST(ToolEncode, CutsLongTexts) {
   const ToolResult result = encode("Guti", R"({"mmegi":")" + std::string(100000, 'x') + "\"}\n");
   EXPECT_EQ(result.exitCode, 1);
   EXPECT_LT(result.errors.size(), 300U);
+}
+
+TEST(ToolStandardInput, ThatCannotBeReadIsAFailure) {
+  for (const std::string command : {"decode", "encode"}) {
+    const ToolResult result =
+        runProgram("/bin/sh", {"-c", "\"$0\" " + command + " --class KCellularEmmContext < /", QUORL_TOOL});
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.errors, "quorl-tool: standard input cannot be read to its end\n");
+  }
+}
+
+TEST(ToolStandardInput, IsReadNoFurtherThanItsOutputIsTaken) {
+  const ToolResult result =
+      runProgram("/bin/sh", {"-c", "yes 0801 | \"$0\" decode --class KCellularEmmContext > /dev/full", QUORL_TOOL});
+  EXPECT_EQ(result.exitCode, 1);
+  EXPECT_EQ(result.errors, "quorl-tool: standard output cannot be written\n");
 }
 
 }  // namespace

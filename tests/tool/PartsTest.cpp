@@ -1,3 +1,4 @@
+#include <functional>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -5,7 +6,9 @@
 
 #include <gtest/gtest.h>
 
+#include "Commands.h"
 #include "Hexadecimal.h"
+#include "JsonLine.h"
 #include "NearestNames.h"
 #include "ProgressBar.h"
 #include "TextTable.h"
@@ -44,7 +47,23 @@ TEST(NearestNames, ComeNearestFirstThenInTheirOrder) {
 
 TEST(TerminalText, CountsCharactersAndNotBytes) {
   EXPECT_EQ(displayWidth("Größe"), 5U);
-  EXPECT_EQ(printable("a\tb\x7f\nGröße"), "a.b..Größe");
+}
+
+TEST(JsonText, HasNoControlCharacters) {
+  EXPECT_EQ(jsonLine({{"a", "\x1b\x7f\u0080\u009b\u009f\u00a0ß"}}),
+            "{\"a\":\"\\u001b\\u007f\\u0080\\u009b\\u009f\u00a0ß\"}");
+  EXPECT_EQ(withEscapedControls("\"\xc2"), "\"\xc2") << "a cut character at the end";
+}
+
+/// What `print` writes to standard error.
+std::string errorsOf(const std::function<void()>& print) {
+  testing::internal::CaptureStderr();
+  print();
+  return testing::internal::GetCapturedStderr();
+}
+
+TEST(Complaint, IsOneLineWithoutControlCharacters) {
+  EXPECT_EQ(errorsOf([] { complain("no key \"\x1b]0;x\x07\u009b\n\""); }), "quorl-tool: no key \".]0;x...\"\n");
 }
 
 TEST(ProgressText, GrowsWithTheShare) {
