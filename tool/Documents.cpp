@@ -2,8 +2,10 @@
 
 #include <cerrno>
 #include <cstdlib>
+#include <fstream>
 #include <functional>
 #include <memory>
+#include <string_view>
 #include <system_error>
 #include <utility>
 
@@ -74,6 +76,25 @@ tl::expected<void, std::string> tryWriting(const fs::path& directory) {
   return {};
 }
 
+/// Whether both are one file, or would be once they are there.
+bool isSameFile(const fs::path& one, const fs::path& other) {
+  std::error_code error;
+  if (fs::equivalent(one, other, error)) return true;
+  const fs::path first = fs::weakly_canonical(one, error);
+  return !error && first == fs::weakly_canonical(other, error) && !error;
+}
+
+/// Whether a file that is there begins as a database or the log of one does.
+bool looksLikeDatabase(const fs::path& file) {
+  constexpr std::string_view kDatabase{"SQLite format 3\0", 16};
+  constexpr std::string_view kLog{"\x37\x7f\x06", 3};
+  std::error_code ignored;
+  if (!fs::is_regular_file(file, ignored)) return false;
+  std::string begin(kDatabase.size(), ' ');
+  std::ifstream(file, std::ios::binary).read(begin.data(), static_cast<std::streamsize>(begin.size()));
+  return begin == kDatabase || begin.starts_with(kLog);
+}
+
 }  // namespace
 
 fs::path databaseFile(const fs::path& documents) {
@@ -86,11 +107,20 @@ tl::expected<void, std::string> prepareDocuments(const fs::path& documents) {
     return cannotUse(documents, errno != 0 ? systemMessage() : "cannot be made");
   if (auto written = tryWriting(documents); !written) return written;
   const fs::path file = databaseFile(documents);
-  std::error_code ignored;
-  if (!fs::exists(file, ignored)) return {};
+  std::error_code error;
+  if (!fs::exists(file, error)) return error ? cannotUse(file, error.message()) : tl::expected<void, std::string>();
   auto database = Database::open(file, SQLITE_OPEN_READWRITE);
   if (!database) return cannotUse(file, database.error());
   if (auto read = database->run("SELECT count(*) FROM sqlite_master"); !read) return cannotUse(file, read.error());
+  return {};
+}
+
+tl::expected<void, std::string> spareDatabase(const fs::path& target, const fs::path& documents) {
+  bool isPart = looksLikeDatabase(target);
+  if (!documents.empty())
+    for (const char* ending : {"", "-wal", "-shm", "-journal"})
+      isPart = isPart || isSameFile(target, databaseFile(documents).concat(ending));
+  if (isPart) return cannotUse(target, "belongs to a database and is not overwritten");
   return {};
 }
 
@@ -106,14 +136,25 @@ namespace {
 
 /// Opens a database that is there already.
 tl::expected<Database, std::string> openExisting(const fs::path& file) {
-  std::error_code ignored;
-  if (!fs::exists(file, ignored)) return cannotUse(file, "No such file or directory");
+  std::error_code error;
+  if (!fs::exists(file, error)) return cannotUse(file, error ? error.message() : "No such file or directory");
   auto database = Database::open(file, SQLITE_OPEN_READWRITE);
   if (!database) return cannotUse(file, database.error());
   return database;
 }
 
 }  // namespace
+
+std::optional<StoredRows> storedRows(const fs::path& documents, std::int64_t lastId) {
+  const auto database = openExisting(databaseFile(documents));
+  if (!database) return std::nullopt;
+  StoredRows rows;
+  const auto read = database->run(fmt::format("SELECT count(*), max(Id) FROM Metric WHERE Id <= {}", lastId).c_str(),
+                                  [&rows](sqlite3_stmt* row) {
+                                    rows = {sqlite3_column_int64(row, 0), sqlite3_column_int64(row, 1)};
+                                  });
+  return read ? std::optional(rows) : std::nullopt;
+}
 
 tl::expected<std::string, std::string> basebandFamily(const fs::path& documents) {
   constexpr std::int64_t kLeastIceId = 3900000;

@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <filesystem>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -16,6 +17,20 @@ std::filesystem::path databaseFile(const std::filesystem::path& documents);
 /// Makes the directory if it is missing, and finds out whether a store can live there. The store itself ends the
 /// process when it cannot.
 tl::expected<void, std::string> prepareDocuments(const std::filesystem::path& documents);
+
+/// Fails if writing `target` would destroy a database: a part of the one in `documents`, which may be empty, or any
+/// other.
+tl::expected<void, std::string> spareDatabase(const std::filesystem::path& target,
+                                              const std::filesystem::path& documents);
+
+/// Rows of metrics.
+struct StoredRows {
+  std::int64_t count = 0;
+  std::int64_t lastId = 0;  // 0 if there is none
+};
+
+/// The rows with an id of `lastId` at most. Nothing if they cannot be counted, as when there is no database.
+std::optional<StoredRows> storedRows(const std::filesystem::path& documents, std::int64_t lastId);
 
 /// Writes everything that is still in the write-ahead log into the database file, so that the file alone is whole.
 tl::expected<void, std::string> foldWriteAheadLog(const std::filesystem::path& documents);

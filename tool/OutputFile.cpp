@@ -1,0 +1,75 @@
+#include "OutputFile.h"
+
+#include <cerrno>
+#include <cstdio>
+#include <cstdlib>
+#include <optional>
+#include <system_error>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace quorl::tool {
+
+namespace fs = std::filesystem;
+
+namespace {
+
+bool writeAll(int file, std::string_view text) {
+  while (!text.empty()) {
+    const ssize_t written = write(file, text.data(), text.size());
+    if (written < 0 && errno == EINTR) continue;
+    if (written < 0) return false;
+    text.remove_prefix(static_cast<std::size_t>(written));
+  }
+  return true;
+}
+
+/// Writes and closes. Answers the error, 0 if there is none.
+int fill(int file, std::string_view text) {
+  int error = writeAll(file, text) ? 0 : errno;
+  if (close(file) != 0 && error == 0) error = errno;
+  return error;
+}
+
+int writeInPlace(const fs::path& file, std::string_view text) {
+  const int opened = open(file.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0600);
+  return opened < 0 ? errno : fill(opened, text);
+}
+
+/// The file that can be replaced by another, behind all links; none for devices, pipes, and what may not be written.
+std::optional<fs::path> replaceable(const fs::path& file) {
+  std::error_code error;
+  const fs::file_status status = fs::status(file, error);
+  if (status.type() == fs::file_type::not_found)
+    return fs::is_symlink(fs::symlink_status(file, error)) ? std::nullopt : std::optional(file);
+  if (!fs::is_regular_file(status) || access(file.c_str(), W_OK) != 0) return std::nullopt;
+  fs::path behindLinks = fs::canonical(file, error);
+  return error ? std::nullopt : std::optional(std::move(behindLinks));
+}
+
+/// Nothing if no file can be made beside it.
+std::optional<int> writeBeside(const fs::path& file, std::string_view text) {
+  std::string beside = (file.parent_path() / ".quorl-XXXXXX").string();
+  const int opened = mkostemp(beside.data(), O_CLOEXEC);
+  if (opened < 0) return std::nullopt;
+  struct stat old {};
+  if (stat(file.c_str(), &old) == 0) fchmod(opened, old.st_mode & 0777U);
+  int error = fill(opened, text);
+  if (error == 0 && std::rename(beside.c_str(), file.c_str()) != 0) error = errno;
+  if (error != 0) unlink(beside.c_str());
+  return error;
+}
+
+}  // namespace
+
+tl::expected<void, std::string> writeWholeFile(const fs::path& file, std::string_view text) {
+  std::optional<int> error;
+  if (const auto target = replaceable(file)) error = writeBeside(*target, text);
+  if (!error) error = writeInPlace(file, text);
+  if (*error != 0) return tl::unexpected(std::generic_category().message(*error));
+  return {};
+}
+
+}  // namespace quorl::tool
