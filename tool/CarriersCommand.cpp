@@ -1,11 +1,10 @@
 #include <chrono>
 #include <cstdint>
-#include <filesystem>
 #include <iostream>
+#include <limits>
 #include <memory>
 #include <optional>
 #include <string>
-#include <system_error>
 #include <utility>
 #include <vector>
 
@@ -16,11 +15,12 @@
 #include "JsonLine.h"
 #include "Player.h"
 #include "ProductRun.h"
+#include "RemovedRows.h"
+#include "RunDocuments.h"
 #include "TextTable.h"
 #include "ToolLog.h"
 #include "app/HardwareManager.h"
 #include "base/NotificationCenter.h"
-#include "base/Uuid.h"
 #include "shell/NotificationNames.h"
 #include "telephony/CarrierNameSegmentView.h"
 
@@ -38,29 +38,6 @@ struct CarriersOptions {
   std::vector<std::size_t> pressedTabs;  // counted from 1
   bool isVerbose = false;
   bool asJson = false;
-};
-
-/// The documents directory of the run. One that the user has not named is removed again.
-class RunDocuments {
- public:
-  explicit RunDocuments(std::string named) : path_(std::move(named)), isNamed_(!path_.empty()) {
-    if (isNamed_) return;
-    std::error_code none;
-    path_ = std::filesystem::temp_directory_path(none) / ("quorl-carriers-" + Uuid::make().string());
-  }
-  ~RunDocuments() {
-    std::error_code ignored;
-    if (!isNamed_) std::filesystem::remove_all(path_, ignored);
-  }
-  RunDocuments(const RunDocuments&) = delete;
-  RunDocuments& operator=(const RunDocuments&) = delete;
-
-  const std::filesystem::path& path() const { return path_; }
-  bool isNamed() const { return isNamed_; }
-
- private:
-  std::filesystem::path path_;
-  const bool isNamed_;
 };
 
 /// The carrier bar as the shell keeps it.
@@ -127,14 +104,17 @@ int showCarriers(const CarriersOptions& options) {
   std::size_t faults = 0;
   auto steps = readScript(options.telephonyScript, faults);
   if (!steps) return kFailure;
-  const RunDocuments documents(options.documents);
-  if (const auto prepared = prepareDocuments(documents.path()); !prepared) {
+  const auto made = RunDocuments::make(options.documents);
+  const auto prepared = made ? prepareDocuments((*made)->path()) : tl::unexpected(made.error());
+  if (!prepared) {
     complain(prepared.error());
     return kFailure;
   }
+  const RunDocuments& documents = **made;
+  const RemovedRows removed(documents.path());
 
   // As the product, they live until the process ends.
-  const auto log = ToolLog::install(options.isVerbose);
+  const auto log = installToolLog(options.isVerbose);
   SimulatedPhone::Options description{options.device, documents.path(),
                                       simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)};
   description.isConsoleShown = options.isVerbose;
@@ -147,10 +127,13 @@ int showCarriers(const CarriersOptions& options) {
   const bool isPressed = press(*bar, *phone, options.pressedTabs);
   if (isPressed) options.asJson ? printJson(*bar) : printTables(*bar);
   product.terminate();
+  removed.tell();
+  const std::string lost = log->report();
+  if (!lost.empty()) complain(lost);
 
   const auto folded = documents.isNamed() ? foldWriteAheadLog(documents.path()) : tl::expected<void, std::string>();
   if (!folded) complain(folded.error());
-  return faults == 0 && isPressed && folded ? kSuccess : kFailure;
+  return faults == 0 && isPressed && lost.empty() && folded ? kSuccess : kFailure;
 }
 
 }  // namespace
@@ -161,11 +144,16 @@ void addCarriers(CommandLine& tool) {
       "Starts the product on a simulated phone, plays the script, and shows the record of each slot, the tabs of the\n"
       "carrier bar, and the subscription that the screens show. Without --documents nothing is kept.");
   auto options = std::make_shared<CarriersOptions>();
-  command.addOption("--telephony", options->telephonyScript, "Telephony script to play").required();
+  command.addOption("--telephony", options->telephonyScript, "Telephony script to play").required().notEmpty();
   command.addOption("--until-ms", options->untilMs, "Stop after the events of this time; all of them if left out")
-      .notNegative();
-  command.addOption("--press", options->pressedTabs, "Press this tab at the end, counted from 1; may be repeated");
-  command.addOption("--documents", options->documents, "Directory for the database; made if it is missing");
+      .wholeWithin(0, std::numeric_limits<std::int64_t>::max());
+  command.addOption("--press", options->pressedTabs, "Press this tab at the end, counted from 1; may be repeated")
+      .wholeWithin(1, std::numeric_limits<std::size_t>::max());
+  command
+      .addOption(
+          "--documents", options->documents,
+          "Directory for the database; made if it is missing, and its rows of thirty days ago and older are removed")
+      .notEmpty();
   command.addOption("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")
       .showDefault();
   command.addFlag("--internal-build", options->device.isInternalBuild, "Be an internal build, which has band rows");

@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <iostream>
+#include <limits>
 #include <optional>
 #include <string_view>
 #include <utility>
@@ -11,6 +12,7 @@
 #include <fmt/format.h>
 
 #include "Commands.h"
+#include "OptionNumber.h"
 
 namespace quorl::tool {
 namespace {
@@ -46,18 +48,22 @@ CommandOption& CommandOption::oneOf(std::initializer_list<int> numbers) {
   return *this;
 }
 
-CommandOption& CommandOption::notNegative() {
-  option_->check(CLI::NonNegativeNumber);
+CommandOption& CommandOption::notEmpty() {
+  option_->check([](const std::string& text) { return text.empty() ? "must not be empty" : std::string(); });
   return *this;
 }
 
-CommandOption& CommandOption::within(int least, int most) {
-  option_->check(CLI::Range(least, most));
+CommandOption& CommandOption::wholeWithin(std::uint64_t least, std::uint64_t most) {
+  // The limits of a type say nothing to a reader of the help.
+  const bool isLimit = std::in_range<std::int64_t>(most) && most < std::numeric_limits<std::int64_t>::max();
+  option_->transform(CLI::Validator([=](std::string& text) { return wholeNumberFault(text, least, most); },
+                                    isLimit ? fmt::format("{} to {}", least, most) : std::string()));
   return *this;
 }
 
 CommandOption& CommandOption::within(double least, double most) {
-  option_->check(CLI::Range(least, most));
+  option_->check([=](const std::string& text) { return numberFault(text, least, most); },
+                 fmt::format("{} to {}", least, most));
   return *this;
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <initializer_list>
 #include <memory>
@@ -26,9 +27,11 @@ class CommandOption {
   /// Nothing but these is let pass.
   CommandOption& oneOf(std::initializer_list<const char*> names);
   CommandOption& oneOf(std::initializer_list<int> numbers);
-  CommandOption& notNegative();
-  /// Both limits included.
-  CommandOption& within(int least, int most);
+  /// A text that is not empty.
+  CommandOption& notEmpty();
+  /// A whole number, both limits included.
+  CommandOption& wholeWithin(std::uint64_t least, std::uint64_t most);
+  /// A finite number, both limits included.
   CommandOption& within(double least, double most);
   /// Shows the present value of its variable as the default.
   CommandOption& showDefault();

@@ -1,10 +1,13 @@
+#include <cstdint>
 #include <fstream>
+#include <limits>
 #include <memory>
 #include <string>
 
 #include <fmt/format.h>
 
 #include "Commands.h"
+#include "Documents.h"
 #include "hosts/simulator/Recording.h"
 #include "recording/RecordingMaker.h"
 
@@ -18,6 +21,10 @@ struct MakeRecordingOptions {
 };
 
 int writeRecording(const MakeRecordingOptions& options) {
+  if (const auto spared = spareDatabase(options.output, {}); !spared) {
+    complain(spared.error());
+    return kWrongUse;
+  }
   std::ofstream output(options.output, std::ios::binary);
   const BasebandFamily family = options.family == "ice" ? BasebandFamily::Ice : BasebandFamily::Mav;
   for (const simulator::RecordedEvent& event : makeRecording(family, options.seed))
@@ -36,8 +43,10 @@ void addMakeRecording(CommandLine& tool) {
   command.hide();  // of no use but to the project itself
   auto options = std::make_shared<MakeRecordingOptions>();
   command.addOption("--family", options->family, "Baseband family").required().oneOf({"mav", "ice"});
-  command.addOption("--seed", options->seed, "Where the invention starts").showDefault();
-  command.addOption("--output", options->output, "File to write").required();
+  command.addOption("--seed", options->seed, "Where the invention starts")
+      .wholeWithin(0, std::numeric_limits<std::uint64_t>::max())
+      .showDefault();
+  command.addOption("--output", options->output, "File to write").required().notEmpty();
   command.setAction([options] { return writeRecording(*options); });
 }
 

@@ -18,6 +18,7 @@
 #include "JsonLine.h"
 #include "Player.h"
 #include "ProductRun.h"
+#include "RemovedRows.h"
 #include "RowCounter.h"
 #include "ToolLog.h"
 #include "hosts/simulator/CatalogueClass.h"
@@ -116,10 +117,12 @@ int replay(const ReplayOptions& options) {
   Summary summary;
   for (const RecordedEvent& event : *events) countEvent(event, summary);
 
+  const RemovedRows removed(options.documents);
   // As the product, they live until the process ends.
-  const auto log = ToolLog::install(options.isVerbose);
-  static auto* phone = new SimulatedPhone(
-      {options.device, options.documents, simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)});
+  const auto log = installToolLog(options.isVerbose);
+  static auto* phone =
+      new SimulatedPhone({options.device, options.documents,
+                          simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY), options.isVerbose});
   ProductRun product(*phone);
   static const auto* rows = new RowCounter;
   const auto start = std::chrono::steady_clock::now();
@@ -129,9 +132,11 @@ int replay(const ReplayOptions& options) {
   product.terminate();
   summary.seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
   summary.rowsInserted = rows->count();
-  summary.insertsFailed = log->failedInserts();
+  summary.insertsFailed = log->count();
 
+  removed.tell();
   print(summary);
+  if (const std::string lost = log->report(); !lost.empty()) complain(lost);
   if (!isTaken) complain("the baseband manager had no configuration; is the resource deviceconfig missing?");
   const auto folded = foldWriteAheadLog(options.documents);
   if (!folded) complain(folded.error());
@@ -150,13 +155,21 @@ void addReplay(CommandLine& tool) {
   auto options = std::make_shared<ReplayOptions>();
   command.addOption("--chipset", options->chipset, "Baseband chipset; \"mav\" or \"ice\" in it selects the family")
       .required();
-  command.addOption("--documents", options->documents, "Directory for the database; made if it is missing").required();
+  command
+      .addOption(
+          "--documents", options->documents,
+          "Directory for the database; made if it is missing, and its rows of thirty days ago and older are removed")
+      .required()
+      .notEmpty();
   const CommandOption deviceClass =
       command.addOption("--device-class", options->deviceClass, "Device class, such as Tabrin");
   command.addFlag("--internal-build", options->device.isInternalBuild, "Be an internal build");
   command.addFlag("--carrier-build", options->device.isCarrierBuild, "Be a carrier build");
-  command.addFlag("--rebase-time", options->rebaseTime, "Move the times in the payloads so that the last is now");
-  command.addOption("--telephony", options->telephonyScript, "Telephony script to play beside the recordings");
+  command.addFlag(
+      "--rebase-time", options->rebaseTime,
+      "Move the times in the payloads so that the last is now: rows of thirty days ago and older go at the next start");
+  command.addOption("--telephony", options->telephonyScript, "Telephony script to play beside the recordings")
+      .notEmpty();
   command.addFlag("--verbose", options->isVerbose, "Show the log on standard error");
   command.addOption("FILE", options->files, "Recordings, in the order of playing").required();
   command.setAction([options, deviceClass] {

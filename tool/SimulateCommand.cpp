@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <iostream>
+#include <limits>
 #include <memory>
 #include <optional>
 #include <string>
@@ -15,6 +16,7 @@
 #include "Documents.h"
 #include "JsonLine.h"
 #include "ProgressBar.h"
+#include "RemovedRows.h"
 #include "Simulation.h"
 #include "base/DateText.h"
 #include "hosts/simulator/PhoneServices.h"
@@ -39,7 +41,13 @@ struct SimulateOptions {
   int sessionsPerDay = 4;
   double sessionMinutes = 3;
   bool hasMinutes = false;
+  bool isVerbose = false;
 };
+
+std::optional<Date> startOf(const SimulateOptions& options) {
+  constexpr std::chrono::seconds kUsual{1767605400};  // 2026-01-05 09:30:00 UTC
+  return options.start.empty() ? Date(kUsual) : parseWallClock(options.start);
+}
 
 /// Why the options do not fit together; empty if they do.
 std::string contradiction(const SimulateOptions& options) {
@@ -47,13 +55,14 @@ std::string contradiction(const SimulateOptions& options) {
   if (!options.output.empty() && options.historyDays > 0) return "--history-days needs --documents";
   if (!options.output.empty() && !options.record.empty()) return "--record needs --documents; --output is a recording";
   if (!options.output.empty() && options.speed > 0) return "--speed needs --documents";
+  if (options.historyDays > 0 && !options.hasMinutes && (!options.record.empty() || options.speed > 0))
+    return "--record and --speed need --minutes beside --history-days";
   if (!options.documents.empty() && !options.start.empty()) return "--start needs --output; --documents ends now";
-  return {};
-}
-
-std::optional<Date> startOf(const SimulateOptions& options) {
-  constexpr std::chrono::seconds kUsual{1767605400};  // 2026-01-05 09:30:00 UTC
-  return options.start.empty() ? Date(kUsual) : parseWallClock(options.start);
+  if (!startOf(options)) return fmt::format("{} is no time of the form yyyy-MM-dd HH:mm:ss", options.start);
+  const std::string& recording = options.output.empty() ? options.record : options.output;
+  if (recording.empty()) return {};
+  const auto spared = spareDatabase(recording, options.documents);
+  return spared ? std::string() : spared.error();
 }
 
 std::chrono::milliseconds lengthOf(const SimulateOptions& options) {
@@ -76,10 +85,9 @@ double rounded(double value) {
 }
 
 int writeRecording(const SimulateOptions& options, ScenarioChoice choice) {
-  const auto start = startOf(options);
-  if (!start) return fail(fmt::format("{} is no time of the form yyyy-MM-dd HH:mm:ss", options.start));
+  const Date start = startOf(options).value();
   ProgressBar bar;
-  const auto written = recordScenario(std::move(choice), *start, lengthOf(options), options.output,
+  const auto written = recordScenario(std::move(choice), start, lengthOf(options), options.output,
                                       [&bar](double share) { bar.show(share, "of the way"); });
   if (!written) return fail(fmt::format("{}: {}", options.output, written.error()));
   std::cout << jsonLine({{"events", written->events}, {"seconds", rounded(written->seconds)}}) << '\n';
@@ -89,7 +97,8 @@ int writeRecording(const SimulateOptions& options, ScenarioChoice choice) {
 int fillDocuments(const SimulateOptions& options, const ScenarioChoice& choice) {
   if (const auto prepared = prepareDocuments(options.documents); !prepared) return fail(prepared.error());
   const Date until = SystemClock().now();
-  SimulatedProduct product(options.family, options.documents);
+  const RemovedRows removed(options.documents);
+  SimulatedProduct product(options.family, options.documents, options.isVerbose);
   if (options.historyDays > 0) {
     ProgressBar bar;
     const auto made = product.makeHistory(historyOf(options, choice, until), [&bar](const auto& so) {
@@ -110,12 +119,14 @@ int fillDocuments(const SimulateOptions& options, const ScenarioChoice& choice) 
   const auto lived =
       product.live({choice, options.speed > 0 ? options.speed : 1, recording}, lengthOf(options),
                    /*isPaced=*/options.speed > 0, [&bar](double share) { bar.show(share, "of the way"); });
+  removed.tell();
   if (!lived) return fail(lived.error());
   std::cout << jsonLine({{"events", lived->events},
                          {"rowsInserted", lived->rows},
                          {"insertsFailed", lived->insertsFailed},
                          {"seconds", rounded(lived->seconds)}})
             << '\n';
+  if (!lived->failedRows.empty()) complain(lived->failedRows);
   const auto folded = foldWriteAheadLog(options.documents);
   if (!folded) return fail(folded.error());
   return lived->insertsFailed == 0 ? kSuccess : kFailure;
@@ -130,7 +141,7 @@ int simulate(const SimulateOptions& options) {
   auto scenario = simulator::findScenario(options.scenario, resources);
   if (!scenario) {
     for (const std::string& problem : scenario.error()) complain(problem);
-    return kFailure;
+    return simulator::isScenario(options.scenario, resources) ? kFailure : kWrongUse;
   }
   ScenarioChoice choice{*std::move(scenario), options.seed,
                         options.family == "ice" ? simulator::metrics::Family::Ice : simulator::metrics::Family::Mav};
@@ -148,25 +159,35 @@ void addSimulate(CommandLine& tool) {
       "makes\n"
       "of the way. The same scenario, seed and family give the same recording, byte for byte.");
   auto options = std::make_shared<SimulateOptions>();
-  command.addOption("--scenario", options->scenario, "Name of a scenario that ships with it, or a file").required();
-  command.addOption("--seed", options->seed, "Which of the scenario's runs").showDefault();
+  command.addOption("--scenario", options->scenario, "Name of a scenario that ships with it, or a file")
+      .required()
+      .notEmpty();
+  command.addOption("--seed", options->seed, "Which of the scenario's runs")
+      .wholeWithin(0, std::numeric_limits<std::uint64_t>::max())
+      .showDefault();
   command.addOption("--family", options->family, "Baseband family").oneOf({"mav", "ice"}).showDefault();
   const CommandOption minutes =
       command.addOption("--minutes", options->minutes, "Simulated minutes").within(0.0, 60.0 * 24 * 31).showDefault();
-  command.addOption("--output", options->output, "Recording to write");
-  command.addOption("--start", options->start, "Wall-clock time at which a recording begins, yyyy-MM-dd HH:mm:ss");
-  command.addOption("--documents", options->documents, "Directory for a database; made if it is missing");
-  command.addOption("--history-days", options->historyDays, "Days of history before now").within(1, 31);
+  command.addOption("--output", options->output, "Recording to write").notEmpty();
+  command.addOption("--start", options->start, "Wall-clock time at which a recording begins, yyyy-MM-dd HH:mm:ss")
+      .notEmpty();
+  command
+      .addOption(
+          "--documents", options->documents,
+          "Directory for a database; made if it is missing, and its rows of thirty days ago and older are removed")
+      .notEmpty();
+  command.addOption("--history-days", options->historyDays, "Days of history before now").wholeWithin(1, 31);
   command
       .addOption("--sessions-per-day", options->sessionsPerDay, "How often a day of the history the product was used")
-      .within(1, 24)
+      .wholeWithin(1, 24)
       .showDefault();
   command.addOption("--session-minutes", options->sessionMinutes, "For how long each time")
       .within(0.1, 720.0)
       .showDefault();
   command.addOption("--speed", options->speed, "Simulated seconds in a second; as fast as possible without it")
       .within(0.001, 100000.0);
-  command.addOption("--record", options->record, "Recording of what the product was delivered");
+  command.addOption("--record", options->record, "Recording of what the product was delivered").notEmpty();
+  command.addFlag("--verbose", options->isVerbose, "Show the log on standard error");
   command.setAction([options, minutes] {
     options->hasMinutes = minutes.isGiven();
     return simulate(*options);

@@ -59,20 +59,23 @@ tl::expected<RecordedScenario, std::string> recordScenario(simulator::ScenarioCh
 /// The product has no tear-down: what is made here lives until the process ends.
 class SimulatedProduct::Phone {
  public:
-  Phone(std::string chipset, const std::filesystem::path& documents)
+  Phone(std::string chipset, const std::filesystem::path& documents, bool isVerbose)
       : phone({{std::move(chipset), std::nullopt, false, false, {}},
                documents,
-               simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY)}) {}
+               simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY),
+               isVerbose}) {}
 
   simulator::SimulatedPhone phone;
 };
 
-SimulatedProduct::SimulatedProduct(std::string chipset, std::filesystem::path documents)
-    : phone_(*new Phone(std::move(chipset), documents)), documents_(std::move(documents)) {}
+SimulatedProduct::SimulatedProduct(std::string chipset, std::filesystem::path documents, bool isVerbose)
+    : phone_(*new Phone(std::move(chipset), documents, isVerbose)),
+      documents_(std::move(documents)),
+      isVerbose_(isVerbose) {}
 
 tl::expected<MadeHistory, std::string> SimulatedProduct::makeHistory(
     const simulator::HistoryPlan& plan, const std::function<void(const simulator::HistoryProgress&)>& progress) {
-  const auto log = ToolLog::install(/*isVerbose=*/false);
+  installToolLog(isVerbose_);
   const auto begin = std::chrono::steady_clock::now();
   auto made = simulator::writeHistory(databaseFile(documents_), plan, progress);
   installLogSink(nullptr);
@@ -87,7 +90,7 @@ tl::expected<LivedScenario, std::string> SimulatedProduct::live(LiveScenario::Op
   simulator::SimulatedPhone& phone = phone_.phone;
   auto scenario = phone.live(std::move(options));
   if (!scenario) return tl::unexpected(std::move(scenario.error()));
-  const auto log = ToolLog::install(/*isVerbose=*/false);
+  const auto log = installToolLog(isVerbose_);
   const auto begin = std::chrono::steady_clock::now();
   ProductRun product(phone);
   static const auto* rows = new RowCounter;
@@ -107,7 +110,7 @@ tl::expected<LivedScenario, std::string> SimulatedProduct::live(LiveScenario::Op
     (*scenario)->finishRecording([&recorded](const RecordingWriter::Outcome& outcome) { recorded = outcome; });
   });
   if (recording && recorded && !*recorded) return tl::unexpected(recording->string() + ": " + recorded->error());
-  return LivedScenario{(*scenario)->events(), rows->count(), log->failedInserts(), secondsSince(begin)};
+  return LivedScenario{(*scenario)->events(), rows->count(), log->count(), secondsSince(begin), log->report()};
 }
 
 }  // namespace quorl::tool

@@ -41,14 +41,15 @@ struct LivedScenario {
   std::uint64_t rows = 0;
   std::uint64_t insertsFailed = 0;
   double seconds = 0;
+  std::string failedRows;  // a line for the user; empty if all rows are stored
 };
 
 /// The product on a phone without a screen. A process has one at most, as the product has no tear-down. Errors are
 /// one line each.
 class SimulatedProduct {
  public:
-  /// `chipset` decides the family. The documents directory must be usable.
-  SimulatedProduct(std::string chipset, std::filesystem::path documents);
+  /// `chipset` decides the family. The documents directory must be usable. `isVerbose` shows log and console.
+  SimulatedProduct(std::string chipset, std::filesystem::path documents, bool isVerbose);
   SimulatedProduct(const SimulatedProduct&) = delete;
   SimulatedProduct& operator=(const SimulatedProduct&) = delete;
 
@@ -65,6 +66,7 @@ class SimulatedProduct {
   class Phone;
   Phone& phone_;
   const std::filesystem::path documents_;
+  const bool isVerbose_;
 };
 
 }  // namespace quorl::tool

@@ -3,6 +3,7 @@
 #include <utility>
 
 #include "Documents.h"
+#include "RemovedRows.h"
 #include "ToolLog.h"
 #include "app/HardwareManager.h"
 #include "intake/ZelkorWrapper.h"
@@ -24,7 +25,11 @@ simulator::SimulatedPhone::Options phoneOptions(const StoreOptions& options, std
 }  // namespace
 
 void addStoreOptions(Command& command, StoreOptions& options, bool isTable) {
-  command.addOption("--documents", options.documents, "Documents directory that replay filled").required();
+  command
+      .addOption("--documents", options.documents,
+                 "Documents directory that replay filled; its rows of thirty days ago and older are removed")
+      .required()
+      .notEmpty();
   command.addOption("--subscription", options.subscription, "Subscription to look at; 0 if not given").oneOf({0, 1});
   command.addOption("--chipset", options.chipset, "Baseband chipset; that of the stored metrics if not given");
   command.addFlag("--internal-build", options.isInternalBuild, "Be an internal build");
@@ -37,8 +42,11 @@ tl::expected<StoreSession*, std::string> StoreSession::open(const StoreOptions& 
   auto family = basebandFamily(options.documents);
   if (!family) return tl::unexpected(std::move(family.error()));
   if (auto prepared = prepareDocuments(options.documents); !prepared) return tl::unexpected(prepared.error());
-  ToolLog::install(options.isVerbose);
-  return new StoreSession(options, options.chipset.empty() ? *std::move(family) : options.chipset);
+  RemovedRows removed(options.documents);
+  installToolLog(options.isVerbose);
+  auto* session = new StoreSession(options, options.chipset.empty() ? *std::move(family) : options.chipset);
+  removed.tell();
+  return session;
 }
 
 StoreSession::StoreSession(const StoreOptions& options, std::string chipset)

@@ -63,7 +63,7 @@ void addSummary(CommandLine& tool) {
   Command command = tool.addCommand("summary", "Print what a database holds, metric by metric");
   command.setFooter("One line for each metric: technology, metric, rows, and the time of the latest row.");
   auto options = std::make_shared<SummaryOptions>();
-  command.addOption("--documents", options->documents, "Documents directory that replay filled").required();
+  command.addOption("--documents", options->documents, "Documents directory that replay filled").required().notEmpty();
   command.addFlag("--json", options->asJson, "Print one JSON object a line instead of a table");
   command.setAction([options] { return printSummary(*options); });
 }

@@ -6,6 +6,7 @@
 int main(int argc, char** argv) {
   using namespace quorl::tool;
   std::setlocale(LC_ALL, "");
+  std::setlocale(LC_NUMERIC, "C");  // numbers are read and written alike everywhere
   std::ios::sync_with_stdio(false);
   std::cin.tie(nullptr);
 

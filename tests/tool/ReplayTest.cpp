@@ -141,6 +141,12 @@ TEST_F(Replay, ReportsBadLinesAndPlaysTheRest) {
   EXPECT_EQ(rows("SELECT count(*) FROM Metric"), Rows{"3"});
 }
 
+TEST_F(Replay, TextsOfAFileReachTheTerminalWithoutControlCharacters) {
+  recordLine(R"({"\u001b]0;x\u0007":1})");
+  EXPECT_EQ(replay("ice15").errors,
+            "quorl-tool: " + (directory.path() / "recording.jsonl").string() + ":1: there is no key \".]0;x.\"\n");
+}
+
 TEST_F(Replay, PlaysSeveralFilesInTheirOrder) {
   record(kContext, "10017801");
   const fs::path second = directory.path() / "second.jsonl";
@@ -170,6 +176,7 @@ TEST_F(Replay, OldRowsFallToTheNextStart) {
   const auto again = summaryOf(replay("ice15"));
   EXPECT_EQ(again["rowsInserted"], 3);
   EXPECT_EQ(rows("SELECT count(*) FROM Metric"), Rows{"3"}) << "those of 1970 went, and came anew";
+  EXPECT_EQ(replay("ice15").errors, "quorl-tool: 3 rows of thirty days ago and older were removed\n");
 }
 
 TEST_F(Replay, RebasedRowsAreOfTodayAndStay) {
@@ -313,6 +320,7 @@ TEST_F(Replay, FailedInsertsAreCountedAndMakeItFail) {
   EXPECT_EQ(summary["rowsInserted"], 0);
   EXPECT_EQ(summary["insertsFailed"], 3);
   EXPECT_EQ(result.exitCode, 1);
+  EXPECT_EQ(result.errors, "quorl-tool: 3 rows could not be stored: refused\n");
 }
 
 TEST_F(Replay, ShippedRecordingsAreReadWhole) {
@@ -355,6 +363,11 @@ TEST_F(Replay, SummaryOfNothingIsAnError) {
   writeFile(database, "");
   EXPECT_EQ(runTool({"summary", "--documents", documents.string()}).errors,
             "quorl-tool: " + database.string() + ": no such table: Metric\n");
+  fs::remove(database);
+  fs::create_symlink(database, database);
+  EXPECT_EQ(runTool({"summary", "--documents", documents.string()}).errors,
+            "quorl-tool: " + database.string() + ": Too many levels of symbolic links\n")
+      << "it may be there, and cannot be looked at";
 }
 
 }  // namespace

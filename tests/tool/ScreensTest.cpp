@@ -366,7 +366,29 @@ TEST_F(ScreensTool, AnExportThatCannotBeWrittenIsAFailure) {
   EXPECT_EQ(result.errors, "quorl-tool: " + file.string() + ": No such file or directory\n");
 }
 
+TEST_F(ScreensTool, AnExportSparesTheDatabase) {
+  stored("LTE", "Tx Power", "power", "11");
+  const auto database = documents() + "/metricPartV11.sqlite";
+  const ToolResult result = tool({"export", "--time-frame", "daily", "--output", database});
+  EXPECT_EQ(result.exitCode, 2);
+  EXPECT_EQ(result.errors, "quorl-tool: " + database + ": belongs to a database and is not overwritten\n");
+  EXPECT_EQ(tool({"export", "--time-frame", "daily", "--output", database + "-wal"}).exitCode, 2);
+  EXPECT_THAT(tool({"export", "--time-frame", "daily"}).output, HasSubstr("attributeValue: 11, "));
+}
+
 // All of them
+
+TEST_F(ScreensTool, RowsThatTheRetentionTakesAreTold) {
+  stored("LTE", "Tx Power", "power", "1", 0, "-31 days");
+  stored("LTE", "Tx Power", "power", "2", 0, "-40 days");
+  stored("LTE", "Tx Power", "power", "3");
+  EXPECT_EQ(tool({"metrics"}).errors, "quorl-tool: 2 rows of thirty days ago and older were removed\n");
+  EXPECT_EQ(tool({"metrics"}).errors, "");
+  stored("LTE", "Tx Power", "power", "1", 0, "-31 days");
+  EXPECT_EQ(tool({"summary"}).errors, "") << "does not open the store";
+  EXPECT_EQ(tool({"export", "--time-frame", "daily"}).errors,
+            "quorl-tool: 1 row of thirty days ago and older was removed\n");
+}
 
 TEST_F(ScreensTool, WithoutADatabaseNothingIsMade) {
   const auto missing = (directory.path() / "missing").string();

@@ -85,6 +85,29 @@ TEST_F(Simulate, MakesAHistoryThatTheProductFindsAndKeeps) {
   EXPECT_EQ(rowsOf(database, "SELECT count(*) FROM Metric"), std::vector{std::to_string(rows)});
 }
 
+TEST_F(Simulate, LostRowsAreToldWithTheirReason) {
+  ASSERT_EQ(simulate({"--minutes", "0.01", "--documents", documents.string()}).exitCode, 0);
+  RawDatabase(database).run("CREATE TRIGGER refusal BEFORE INSERT ON Metric BEGIN SELECT RAISE(ABORT, 'refused'); END");
+  const auto result = simulate({"--minutes", "0.01", "--documents", documents.string()});
+  EXPECT_EQ(result.exitCode, 1);
+  const auto failed = lastLine(result)["insertsFailed"].get<std::uint64_t>();
+  EXPECT_GT(failed, 1U);
+  EXPECT_EQ(lastLine(result)["rowsInserted"], 0);
+  EXPECT_EQ(result.errors, "quorl-tool: " + std::to_string(failed) + " rows could not be stored: refused\n");
+}
+
+TEST_F(Simulate, WhatTheProductPrintsGoesToStandardErrorAndOnlyWhenAskedFor) {
+  ASSERT_EQ(simulate({"--minutes", "0.01", "--documents", documents.string()}).exitCode, 0);
+  RawDatabase(database).run("CREATE TRIGGER refusal BEFORE INSERT ON Metric BEGIN SELECT RAISE(ABORT, 'refused'); END");
+  constexpr char kPrinted[] = "\nerror occurred while fetching metric contents ";
+  const auto verbose = simulate({"--minutes", "0.01", "--documents", documents.string(), "--verbose"});
+  EXPECT_NE(verbose.errors.find(kPrinted), std::string::npos) << verbose.errors;
+  EXPECT_NE(verbose.errors.find("Appdelegate - applicationDidBecomeActive"), std::string::npos);
+  EXPECT_EQ(verbose.outputLines().size(), 1U);
+  const auto quiet = simulate({"--minutes", "0.01", "--documents", documents.string()});
+  EXPECT_EQ(quiet.errorLines().size(), 1U) << quiet.errors;
+}
+
 TEST_F(Simulate, AHistoryIsAsLongAsItsUse) {
   const auto made = simulate({"--documents", documents.string(), "--history-days", "3", "--sessions-per-day", "2",
                               "--session-minutes", "0.5"});
@@ -116,12 +139,13 @@ TEST_F(Simulate, TellsWhatCannotBeWritten) {
 }
 
 TEST_F(Simulate, TellsWhatIsWrongWithAScenario) {
-  EXPECT_EQ(runTool({"simulate", "--scenario", "moon", "--output", recording.string()}).exitCode, 1);
+  EXPECT_EQ(runTool({"simulate", "--scenario", "moon", "--output", recording.string()}).exitCode, 2);
   const fs::path scenario = directory.path() / "wrong.scenario";
   writeFile(scenario, "nonsense here\n");
   const auto result = runTool({"simulate", "--scenario", scenario.string(), "--output", recording.string()});
   EXPECT_EQ(result.exitCode, 1);
-  EXPECT_NE(result.errors.find("wrong.scenario:1: "), std::string::npos) << result.errors;
+  EXPECT_EQ(result.errors.rfind("quorl-tool: " + scenario.string() + ":1: ", 0), 0U) << result.errors;
+  EXPECT_EQ(runTool({"simulate", "--scenario", "/no/such.scenario", "--output", recording.string()}).exitCode, 1);
   EXPECT_FALSE(fs::exists(recording));
 }
 
@@ -131,9 +155,24 @@ TEST_F(Simulate, RefusesOptionsThatDoNotFitTogether) {
   EXPECT_EQ(simulate({"--output", recording.string(), "--history-days", "3"}).exitCode, 2);
   EXPECT_EQ(simulate({"--output", recording.string(), "--speed", "3"}).exitCode, 2);
   EXPECT_EQ(simulate({"--documents", documents.string(), "--start", "2026-01-05 09:30:00"}).exitCode, 2);
-  EXPECT_EQ(simulate({"--output", recording.string(), "--start", "yesterday"}).exitCode, 1);
+  EXPECT_EQ(simulate({"--output", recording.string(), "--start", "yesterday"}).exitCode, 2);
   EXPECT_EQ(simulate({"--output", recording.string(), "--family", "neither"}).exitCode, 2);
+  EXPECT_EQ(simulate({"--documents", documents.string(), "--history-days", "3", "--speed", "3"}).exitCode, 2);
+  EXPECT_EQ(simulate({"--documents", documents.string(), "--history-days", "3", "--record", recording.string()}).errors,
+            "quorl-tool: --record and --speed need --minutes beside --history-days (see quorl-tool simulate --help)\n");
   EXPECT_FALSE(fs::exists(documents));
+}
+
+TEST_F(Simulate, SparesTheDatabase) {
+  ASSERT_EQ(simulate({"--minutes", "0.01", "--documents", documents.string()}).exitCode, 0);
+  const std::string before = readFile(database);
+  const auto recorded =
+      simulate({"--minutes", "0.01", "--documents", documents.string(), "--record", database.string()});
+  EXPECT_EQ(recorded.exitCode, 2);
+  EXPECT_EQ(recorded.errors, "quorl-tool: " + database.string() +
+                                 ": belongs to a database and is not overwritten (see quorl-tool simulate --help)\n");
+  EXPECT_EQ(simulate({"--minutes", "0.01", "--output", database.string()}).exitCode, 2);
+  EXPECT_TRUE(readFile(database) == before);
 }
 
 }  // namespace
