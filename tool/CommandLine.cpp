@@ -109,6 +109,7 @@ void Command::setAction(Action action) {
 CommandLine::CommandLine(const std::string& description, const std::string& name)
     : app_(std::make_unique<CLI::App>(description, name)) {
   app_->require_subcommand(1);
+  app_->set_version_flag("--version", name + " " QUORL_VERSION, "Print the version and exit");
 }
 
 CommandLine::~CommandLine() = default;
@@ -122,6 +123,9 @@ int CommandLine::run(int argc, char** argv) {
     app_->parse(argc, argv);
   } catch (const CLI::CallForHelp&) {
     std::cout << app_->help();
+    return kSuccess;
+  } catch (const CLI::CallForVersion& version) {
+    std::cout << version.what() << '\n';
     return kSuccess;
   } catch (const CLI::ParseError& error) {
     complain(faultText(*app_, error, argc, argv) + " (see quorl-tool --help)");

@@ -2,6 +2,7 @@
 #include <string>
 #include <vector>
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "ToolRun.h"
@@ -63,6 +64,13 @@ TEST(ToolUsage, HelpIsAResult) {
     EXPECT_EQ(one.errors, "") << command;
     EXPECT_NE(one.output.find("Usage: quorl-tool " + command), std::string::npos) << one.output;
   }
+}
+
+TEST(ToolUsage, VersionIsAResult) {
+  const ToolResult result = runTool({"--version"});
+  EXPECT_EQ(result.exitCode, 0);
+  EXPECT_EQ(result.errors, "");
+  EXPECT_THAT(result.output, testing::MatchesRegex("quorl-tool [0-9]+\\.[0-9]+\\.[0-9]+\n"));
 }
 
 TEST(ToolUsage, TheManualNamesEverySubcommand) {
