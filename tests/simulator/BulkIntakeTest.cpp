@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 #include <sqlite3.h>
+#include <sys/stat.h>
 
 #include "app/HardwareManager.h"
 #include "hosts/simulator/Recording.h"
@@ -119,10 +120,14 @@ class BulkStoreTest : public testing::Test {
   const fs::path file = directory.path() / "history.sqlite";
 };
 
-TEST_F(BulkStoreTest, KeepsTheFileForItsUserAlone) {
+TEST_F(BulkStoreTest, KeepsItsFilesForTheirUserAlone) {
+  const mode_t before = ::umask(S_IWGRP | S_IWOTH);
   auto store = BulkStore::open(file);
+  ::umask(before);
   ASSERT_TRUE(store);
   (*store)->insertMetric(row("1"), {});
+  for (const char* name : {"history.sqlite", "history.sqlite-wal", "history.sqlite-shm"})
+    EXPECT_EQ(fs::status(directory.path() / name).permissions(), fs::perms(0600)) << name;
   ASSERT_TRUE((*store)->finish());
   EXPECT_EQ(fs::status(file).permissions(), fs::perms(0600));
 }

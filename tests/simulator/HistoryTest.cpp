@@ -2,6 +2,7 @@
 #include <chrono>
 #include <cstdint>
 #include <filesystem>
+#include <fstream>
 #include <string>
 #include <utility>
 #include <vector>
@@ -11,9 +12,11 @@
 #include "hosts/simulator/RecordingWriter.h"
 #include "hosts/simulator/history/BulkIntake.h"
 #include "hosts/simulator/history/History.h"
+#include "hosts/simulator/history/HistoryDraft.h"
 #include "simulator/network/TestScenarios.h"
 #include "store/RawDatabase.h"
 #include "support/FakePlatform.h"
+#include "support/FileSizeLimit.h"
 #include "support/TimeZoneAndLocale.h"
 
 namespace quorl::simulator {
@@ -32,6 +35,12 @@ class HistoryTest : public testing::Test {
   }
   static ScenarioChoice city(std::uint64_t seed) {
     return {network::shippedScenario("city"), seed, metrics::Family::Mav};
+  }
+  std::vector<std::string> entries() const {
+    std::vector<std::string> names;
+    for (const auto& entry : fs::directory_iterator(platform.directory.path()))
+      names.push_back(entry.path().filename().string());
+    return names;
   }
   std::vector<test::Row> query(const char* sql) { return test::RawDatabase(file).run(sql); }
 
@@ -81,7 +90,75 @@ TEST_F(HistoryTest, TellsWhichFileCannotBeWritten) {
   const auto made = writeHistory(platform.directory.path() / "no" / "folder.sqlite", plan(1), {});
   ASSERT_FALSE(made);
   EXPECT_EQ(made.error(),
-            (platform.directory.path() / "no" / "folder.sqlite").string() + ": unable to open database file");
+            (platform.directory.path() / "no" / "folder.sqlite").string() + ": No such file or directory");
+}
+
+TEST_F(HistoryTest, IsThereOnlyWhenItIsWhole) {
+  bool wasThere = false;
+  ASSERT_TRUE(writeHistory(file, plan(1), [&](const HistoryProgress&) { wasThere = wasThere || fs::exists(file); }));
+  EXPECT_FALSE(wasThere);
+  EXPECT_EQ(entries(), std::vector<std::string>{"history.sqlite"}) << "no write-ahead log is needed";
+  EXPECT_EQ(fs::status(file).permissions(), fs::perms(0600));
+}
+
+TEST_F(HistoryTest, ThatIsStoppedLeavesNothing) {
+  int sessions = 0;
+  const auto made = writeHistory(
+      file, plan(2), [&](const HistoryProgress&) { ++sessions; }, [&] { return sessions == 2; });
+  ASSERT_FALSE(made);
+  EXPECT_EQ(made.error(), file.string() + ": stopped before its end");
+  EXPECT_EQ(sessions, 2);
+  EXPECT_EQ(entries(), std::vector<std::string>());
+}
+
+TEST_F(HistoryTest, ThatDoesNotFitOnTheDiskLeavesNothing) {
+  {
+    const test::FileSizeLimit limit(128 * 1024);
+    const auto made = writeHistory(file, plan(1), {});
+    ASSERT_FALSE(made);
+    EXPECT_TRUE(made.error().starts_with(file.string() + ": ")) << made.error();
+  }
+  EXPECT_EQ(entries(), std::vector<std::string>());
+}
+
+TEST_F(HistoryTest, NeverReplacesAFileThatCameMeanwhile) {
+  const auto made = writeHistory(file, plan(1), [&](const HistoryProgress&) { std::ofstream(file) << "other"; });
+  ASSERT_FALSE(made);
+  EXPECT_EQ(made.error(), file.string() + ": another program has made it meanwhile");
+  EXPECT_EQ(entries(), std::vector<std::string>{"history.sqlite"});
+  EXPECT_EQ(fs::file_size(file), 5U);
+}
+
+TEST_F(HistoryTest, IsAddedToAFileThatIsThere) {
+  const auto first = writeHistory(file, plan(1), {});
+  ASSERT_TRUE(first);
+  const auto second = writeHistory(file, plan(1), {});
+  ASSERT_TRUE(second) << second.error();
+  EXPECT_EQ(query("SELECT count(*) FROM Metric"),
+            (std::vector<test::Row>{{std::to_string(first->rows + second->rows)}}));
+}
+
+TEST_F(HistoryTest, TakesNothingFromARemovedDatabase) {
+  for (const char* left : {"history.sqlite-wal", "history.sqlite-shm", "history.sqlite-journal"})
+    std::ofstream(platform.directory.path() / left) << "left";
+  ASSERT_TRUE(writeHistory(file, plan(1), {}));
+  EXPECT_EQ(entries(), std::vector<std::string>{"history.sqlite"});
+}
+
+TEST_F(HistoryTest, RemovesWhatAKilledOneHasLeftAndNothingElse) {
+  const auto left = platform.directory.path() / ".quorl-history-killed";
+  const auto foreign = platform.directory.path() / ".quorl-history-notes";
+  for (const fs::path& folder : {left, foreign}) fs::create_directory(folder);
+  for (const char* name : {"history.sqlite", "history.sqlite-wal", "history.sqlite-shm"})
+    std::ofstream(left / name) << "x";
+  std::ofstream(foreign / "notes.txt") << "mine";
+  const auto living = HistoryDraft::of(file);
+  ASSERT_TRUE(living) << living.error();
+  std::ofstream((*living)->file()) << "half";
+  removeAbandonedHistories(file);
+  EXPECT_FALSE(fs::exists(left));
+  EXPECT_TRUE(fs::exists(foreign / "notes.txt"));
+  EXPECT_TRUE(fs::exists((*living)->file())) << "its maker lives";
 }
 
 TEST_F(HistoryTest, OfARecordedWayHasTheRowsOfTheWayItself) {

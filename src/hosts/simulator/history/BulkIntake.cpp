@@ -6,14 +6,15 @@
 
 namespace quorl::simulator {
 
-tl::expected<std::unique_ptr<BulkIntake>, std::string> BulkIntake::open(const std::filesystem::path& database) {
+tl::expected<std::unique_ptr<BulkIntake>, std::string> BulkIntake::open(const std::filesystem::path& database,
+                                                                        const std::filesystem::path& name) {
   auto store = BulkStore::open(database);
-  if (!store) return tl::unexpected(database.string() + ": " + store.error());
-  return std::unique_ptr<BulkIntake>(new BulkIntake(database, *std::move(store)));
+  if (!store) return tl::unexpected(name.string() + ": " + store.error());
+  return std::unique_ptr<BulkIntake>(new BulkIntake(name, *std::move(store)));
 }
 
-BulkIntake::BulkIntake(std::filesystem::path database, std::unique_ptr<BulkStore> store)
-    : database_(std::move(database)),
+BulkIntake::BulkIntake(std::filesystem::path name, std::unique_ptr<BulkStore> store)
+    : name_(std::move(name)),
       store_(std::move(store)),
       service_(MetricService::make(*store_, ZelkorWrapper::sharedInstance())) {}
 
@@ -25,7 +26,7 @@ bool BulkIntake::take(const RecordedEvent& event) {
 }
 
 tl::expected<void, std::string> BulkIntake::finish() {
-  if (auto outcome = store_->finish(); !outcome) return tl::unexpected(database_.string() + ": " + outcome.error());
+  if (auto outcome = store_->finish(); !outcome) return tl::unexpected(name_.string() + ": " + outcome.error());
   return {};
 }
 

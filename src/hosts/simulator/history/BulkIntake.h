@@ -20,7 +20,12 @@ namespace quorl::simulator {
 class BulkIntake {
  public:
   /// The error says in one line why the file cannot be used.
-  static tl::expected<std::unique_ptr<BulkIntake>, std::string> open(const std::filesystem::path& database);
+  static tl::expected<std::unique_ptr<BulkIntake>, std::string> open(const std::filesystem::path& database) {
+    return open(database, database);
+  }
+  /// For a file that is to be known by another name: errors tell that one.
+  static tl::expected<std::unique_ptr<BulkIntake>, std::string> open(const std::filesystem::path& database,
+                                                                     const std::filesystem::path& name);
 
   /// False once something has failed; nothing more is written then.
   bool take(const RecordedEvent& event);
@@ -30,9 +35,9 @@ class BulkIntake {
   tl::expected<void, std::string> finish();
 
  private:
-  BulkIntake(std::filesystem::path database, std::unique_ptr<BulkStore> store);
+  BulkIntake(std::filesystem::path name, std::unique_ptr<BulkStore> store);
 
-  const std::filesystem::path database_;
+  const std::filesystem::path name_;
   const std::unique_ptr<BulkStore> store_;
   const std::shared_ptr<MetricService> service_;
   std::uint64_t events_ = 0;

@@ -2,10 +2,12 @@
 
 #include <utility>
 
+#include <fcntl.h>
 #include <sqlite3.h>
 #include <sys/stat.h>
 
 #include "base/DateText.h"
+#include "hosts/simulator/Descriptor.h"
 #include "store/MetricBinding.h"
 #include "store/MetricStatements.h"
 
@@ -14,6 +16,12 @@ namespace {
 
 constexpr std::uint64_t kRowsOfATransaction = 50000;
 constexpr int kBusyTimeoutMs = 5000;
+
+/// As the store does: rows hold cell identities. The journal files take over the mode, so it is right before them.
+void keepForUserAlone(const std::filesystem::path& file) {
+  const Descriptor made(::open(file.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, S_IRUSR | S_IWUSR));
+  if (made.isOpen()) ::fchmod(made.number(), S_IRUSR | S_IWUSR);
+}
 
 SQLiteError cannotRead() {
   return {SQLiteError::Case::Prepare, "rows are only written here"};
@@ -28,14 +36,13 @@ void BulkStore::CloseDatabase::operator()(sqlite3* database) const {
 BulkStore::~BulkStore() = default;
 
 tl::expected<std::unique_ptr<BulkStore>, std::string> BulkStore::open(const std::filesystem::path& file) {
+  keepForUserAlone(file);
   sqlite3* database = nullptr;
   const int flags = SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE | SQLITE_OPEN_NOMUTEX;
   const int code = sqlite3_open_v2(file.c_str(), &database, flags, nullptr);
   std::unique_ptr<BulkStore> store(new BulkStore(database));
   if (code != SQLITE_OK) return tl::unexpected(std::string(sqlite3_errmsg(database)));
   if (auto prepared = store->prepare(); !prepared) return tl::unexpected(std::move(prepared.error()));
-  // As the store does: rows hold cell identities.
-  ::chmod(file.c_str(), S_IRUSR | S_IWUSR);
   return store;
 }
 

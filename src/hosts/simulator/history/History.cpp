@@ -3,12 +3,14 @@
 #include <algorithm>
 #include <chrono>
 #include <random>
+#include <system_error>
 #include <utility>
 #include <vector>
 
 #include "base/DateText.h"
 #include "hosts/simulator/EpochTime.h"
 #include "hosts/simulator/history/BulkIntake.h"
+#include "hosts/simulator/history/HistoryDraft.h"
 
 namespace quorl::simulator {
 namespace {
@@ -51,6 +53,28 @@ bool playSession(const HistoryPlan& plan, std::uint64_t number, Date start, Bulk
   return isGood;
 }
 
+/// Fills a file, which errors call `name`.
+tl::expected<HistoryProgress, std::string> fill(const std::filesystem::path& database,
+                                                const std::filesystem::path& name, const HistoryPlan& plan,
+                                                const std::function<void(const HistoryProgress&)>& progress,
+                                                const std::function<bool()>& isStopped) {
+  auto intake = BulkIntake::open(database, name);
+  if (!intake) return tl::unexpected(std::move(intake.error()));
+  const std::vector<Date> times = sessionTimes(plan);
+  HistoryProgress so;
+  so.sessions = static_cast<int>(times.size());
+  for (std::size_t i = 0; i < times.size(); ++i) {
+    if (isStopped && isStopped()) return tl::unexpected(name.string() + ": stopped before its end");
+    if (!playSession(plan, i, times[i], **intake)) break;
+    ++so.sessionsDone;
+    so.events = (*intake)->events();
+    so.rows = (*intake)->rows();
+    if (progress) progress(so);
+  }
+  if (auto finished = (*intake)->finish(); !finished) return tl::unexpected(std::move(finished.error()));
+  return so;
+}
+
 }  // namespace
 
 std::vector<Date> sessionTimes(const HistoryPlan& plan) {
@@ -71,21 +95,22 @@ std::vector<Date> sessionTimes(const HistoryPlan& plan) {
 }
 
 tl::expected<HistoryProgress, std::string> writeHistory(const std::filesystem::path& database, const HistoryPlan& plan,
-                                                        const std::function<void(const HistoryProgress&)>& progress) {
-  auto intake = BulkIntake::open(database);
-  if (!intake) return tl::unexpected(std::move(intake.error()));
-  const std::vector<Date> times = sessionTimes(plan);
-  HistoryProgress so;
-  so.sessions = static_cast<int>(times.size());
-  for (std::size_t i = 0; i < times.size(); ++i) {
-    if (!playSession(plan, i, times[i], **intake)) break;
-    ++so.sessionsDone;
-    so.events = (*intake)->events();
-    so.rows = (*intake)->rows();
-    if (progress) progress(so);
-  }
-  if (auto finished = (*intake)->finish(); !finished) return tl::unexpected(std::move(finished.error()));
-  return so;
+                                                        const std::function<void(const HistoryProgress&)>& progress,
+                                                        const std::function<bool()>& isStopped) {
+  removeAbandonedHistories(database);
+  std::error_code ignored;
+  if (std::filesystem::exists(database, ignored)) return fill(database, database, plan, progress, isStopped);
+  const auto draft = HistoryDraft::of(database);
+  if (!draft) return tl::unexpected(database.string() + ": " + draft.error());
+  auto made = fill((*draft)->file(), database, plan, progress, isStopped);
+  if (!made) return made;
+  if (const auto published = (*draft)->publish(); !published)
+    return tl::unexpected(database.string() + ": " + published.error());
+  return made;
+}
+
+void removeAbandonedHistories(const std::filesystem::path& database) {
+  HistoryDraft::removeAbandoned(database);
 }
 
 }  // namespace quorl::simulator

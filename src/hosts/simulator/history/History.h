@@ -31,12 +31,18 @@ struct HistoryProgress {
   std::uint64_t rows = 0;
 };
 
-/// Writes the rows of a history into a database file, in bulk. `progress` is called after each session and may be
-/// empty. The error says in one line what went wrong; what was written before it stays.
+/// Writes the rows of a history into a database file, in bulk. A file that is missing is made beside its place and
+/// comes there whole or not at all, and never over one that has come there meanwhile; one that is there gets the rows
+/// added. `progress` is called after each session, `isStopped` asked before each; both may be empty. The error says in
+/// one line what went wrong, or that it was stopped; of a file that was there before, it keeps what was written so far.
 ///
 /// Main thread, on an installed platform whose device is of the plan's family, and before the product is started.
 tl::expected<HistoryProgress, std::string> writeHistory(const std::filesystem::path& database, const HistoryPlan& plan,
-                                                        const std::function<void(const HistoryProgress&)>& progress);
+                                                        const std::function<void(const HistoryProgress&)>& progress,
+                                                        const std::function<bool()>& isStopped = {});
+
+/// Removes what killed programs have left of histories for this file.
+void removeAbandonedHistories(const std::filesystem::path& database);
 
 /// When the sessions of a plan begin, earliest first. The same plan gives the same times.
 std::vector<Date> sessionTimes(const HistoryPlan& plan);
