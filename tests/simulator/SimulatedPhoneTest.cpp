@@ -1,3 +1,4 @@
+#include <cerrno>
 #include <chrono>
 #include <filesystem>
 #include <fstream>
@@ -8,8 +9,10 @@
 #include <vector>
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include "hosts/simulator/SimulatedPhone.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "support/FakePlatform.h"
 #include "support/SteppedQueue.h"
 #include "support/TemporaryDirectory.h"
@@ -125,6 +128,20 @@ TEST(ResourceDirectories, AnswerTheFirstFileOfThatNameAndType) {
   EXPECT_EQ(resources.path("Quorl2", "deviceconfig"), std::nullopt) << "a directory is no resource";
 }
 
+/// To the superuser everything is permitted; while this lives, the process is not.
+class OrdinaryUser {
+ public:
+  OrdinaryUser() { EXPECT_TRUE(!isSuperuser_ || ::seteuid(kNobody) == 0); }
+  ~OrdinaryUser() { EXPECT_TRUE(!isSuperuser_ || ::seteuid(0) == 0); }
+  OrdinaryUser(const OrdinaryUser&) = delete;
+  OrdinaryUser& operator=(const OrdinaryUser&) = delete;
+
+ private:
+  static constexpr uid_t kNobody = 65534;
+
+  const bool isSuperuser_ = ::geteuid() == 0;
+};
+
 TEST(FixedDocumentsDirectory, IsMadeForItsUserAlone) {
   const test::TemporaryDirectory directory;
   const fs::path wanted = directory.path() / "new" / "documents";
@@ -145,8 +162,50 @@ TEST(FixedDocumentsDirectory, ThatIsThereKeepsItsPermissions) {
 TEST(FixedDocumentsDirectory, ThatCannotBeMadeIsNone) {
   const test::TemporaryDirectory directory;
   std::ofstream(directory.path() / "file") << "x";
-  EXPECT_EQ(FixedDocumentsDirectory(directory.path() / "file").path(), std::nullopt);
-  EXPECT_EQ(FixedDocumentsDirectory(directory.path() / "file" / "below").path(), std::nullopt);
+  for (const fs::path& path : {directory.path() / "file", directory.path() / "file" / "below"}) {
+    EXPECT_EQ(FixedDocumentsDirectory(path).path(), std::nullopt);
+    EXPECT_EQ(errno, ENOTDIR) << path;
+  }
+}
+
+TEST(FixedDocumentsDirectory, ThatMayNotBeMadeSaysSo) {
+  const test::TemporaryDirectory directory;
+  fs::permissions(directory.path(), fs::perms(0555));
+  const OrdinaryUser user;
+  for (const fs::path& path : {directory.path() / "documents", directory.path() / "new" / "documents"}) {
+    EXPECT_EQ(FixedDocumentsDirectory(path).path(), std::nullopt);
+    EXPECT_EQ(errno, EACCES) << path;
+  }
+}
+
+TEST(PrepareDocuments, MakesAMissingFolderAndLeavesNothingInIt) {
+  const test::TemporaryDirectory directory;
+  const fs::path documents = directory.path() / "new" / "documents";
+  EXPECT_TRUE(prepareDocuments(documents));
+  EXPECT_TRUE(fs::is_directory(documents));
+  EXPECT_TRUE(fs::is_empty(documents));
+}
+
+TEST(PrepareDocuments, TellsWhyAStoreCannotLiveThere) {
+  const test::TemporaryDirectory directory;
+  std::ofstream(directory.path() / "file") << "x";
+  const auto noFolder = prepareDocuments(directory.path() / "file");
+  ASSERT_FALSE(noFolder);
+  EXPECT_EQ(noFolder.error(), (directory.path() / "file").string() + ": Not a directory");
+  const fs::path database = directory.path() / "metricPartV11.sqlite";
+  std::ofstream(database) << "this is a text and long enough not to be taken for an empty database, whatever it says";
+  const auto noDatabase = prepareDocuments(directory.path());
+  ASSERT_FALSE(noDatabase);
+  EXPECT_EQ(noDatabase.error(), database.string() + ": file is not a database");
+}
+
+TEST(PrepareDocuments, TellsOfAFolderThatCannotBeWritten) {
+  const test::TemporaryDirectory directory;
+  fs::permissions(directory.path(), fs::perms(0555));
+  const OrdinaryUser user;
+  const auto prepared = prepareDocuments(directory.path());
+  ASSERT_FALSE(prepared);
+  EXPECT_EQ(prepared.error(), directory.path().string() + ": Permission denied");
 }
 
 TEST(GettextStrings, AnswerTheKeyWithoutATranslation) {

@@ -1,6 +1,7 @@
 #include "hosts/simulator/PhoneServices.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <cstdio>
 #include <system_error>
 #include <utility>
@@ -18,6 +19,13 @@ namespace {
 
 constexpr Logger hostLog{"host"};
 constexpr char kDomain[] = "Localizable";
+
+/// In one piece, as other threads print as well.
+void printLine(std::string_view line, std::FILE* output) {
+  std::string whole(line);
+  whole.push_back('\n');
+  std::fwrite(whole.data(), 1, whole.size(), output);
+}
 
 }  // namespace
 
@@ -63,7 +71,12 @@ std::optional<fs::path> FixedDocumentsDirectory::path() {
     const fs::path absolute = fs::absolute(directory_, error).lexically_normal();
     const fs::path own = absolute.has_filename() ? absolute : absolute.parent_path();
     fs::create_directories(own.parent_path(), error);
-    if (::mkdir(own.c_str(), S_IRWXU) != 0 && !fs::is_directory(own, error)) return std::nullopt;
+    int reason = error.value();
+    if (reason == 0 && ::mkdir(own.c_str(), S_IRWXU) != 0) reason = errno;
+    if (reason != 0 && !fs::is_directory(own, error)) {
+      errno = reason == EEXIST ? ENOTDIR : reason;
+      return std::nullopt;
+    }
   }
   return directory_;
 }
@@ -85,10 +98,12 @@ std::string GettextStrings::localized(std::string_view key) {
 }
 
 void StandardErrorConsole::print(std::string_view line) {
-  if (!isShown_) return;
-  std::string whole(line);
-  whole.push_back('\n');
-  std::fwrite(whole.data(), 1, whole.size(), stderr);
+  if (isShown_) printLine(line, stderr);
+}
+
+void StandardOutputConsole::print(std::string_view line) {
+  printLine(line, stdout);
+  std::fflush(stdout);
 }
 
 void PrintedAlerts::present(Alert alert) {

@@ -50,7 +50,7 @@ class ResourceDirectories final : public Resources {
 class FixedDocumentsDirectory final : public DocumentsDirectory {
  public:
   explicit FixedDocumentsDirectory(std::filesystem::path directory) : directory_(std::move(directory)) {}
-  /// A directory that is already there keeps its permissions.
+  /// A directory that is already there keeps its permissions. With nothing, `errno` says why.
   std::optional<std::filesystem::path> path() override;
 
  private:
@@ -74,6 +74,12 @@ class StandardErrorConsole final : public Console {
 
  private:
   const bool isShown_;
+};
+
+/// Standard output, for a program that has no results to show there. Each line is shown at once.
+class StandardOutputConsole final : public Console {
+ public:
+  void print(std::string_view line) override;
 };
 
 /// Prints a dialog and presses its button, once what is at hand has ended.
