@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "hosts/desktop/QtQueue.h"
+#include "support/window/WindowFixture.h"
 
 namespace quorl {
 namespace {
@@ -44,6 +45,15 @@ TEST_F(QtQueueTest, DelayedTasksComeInTheOrderOfTheirTimes) {
   runUntil(2);
   EXPECT_THAT(ran_, ElementsAre("sooner", "later"));
   EXPECT_GE(std::chrono::steady_clock::now() - start, 30ms);
+}
+
+TEST_F(QtQueueTest, ATaskOfAMonthDoesNotComeAtOnce) {
+  test::WarningCollector warnings;
+  for (const int days : {24, 25, 50, 365}) queue_.asyncAfter(24h * days, task("far"));
+  queue_.asyncAfter(10ms, task("near"));
+  runUntil(1);
+  EXPECT_THAT(ran_, ElementsAre("near"));
+  EXPECT_THAT(warnings.take(), IsEmpty()) << "a timer counts in 32 bits";
 }
 
 TEST_F(QtQueueTest, TasksOfOtherThreadsRunOnTheQueuesThread) {

@@ -8,6 +8,25 @@
 #include <utility>
 
 namespace quorl::desktop {
+namespace {
+
+using std::chrono::milliseconds;
+using std::chrono::steady_clock;
+
+/// Timers of the event loop count in 32 bits: 24.8 days.
+constexpr std::chrono::hours kLongestTimer{24 * 24};
+
+void runAt(steady_clock::time_point due, QObject* receiver, Queue::Task task) {
+  const auto left = std::max(std::chrono::ceil<milliseconds>(due - steady_clock::now()), milliseconds(0));
+  const bool isLast = left <= kLongestTimer;
+  QTimer::singleShot(std::min<milliseconds>(left, kLongestTimer), Qt::PreciseTimer, receiver,
+                     [due, receiver, isLast, task = std::move(task)]() mutable noexcept {
+                       if (isLast) return task();
+                       runAt(due, receiver, std::move(task));
+                     });
+}
+
+}  // namespace
 
 QtQueue::QtQueue(std::string label) : label_(std::move(label)), receiver_(std::make_unique<QObject>()) {}
 
@@ -21,12 +40,8 @@ void QtQueue::async(Task task) {
 
 void QtQueue::asyncAfter(Duration delay, Task task) {
   // The timer belongs to the queue's thread, the time counts from this call.
-  const auto due = std::chrono::steady_clock::now() + delay;
-  async([receiver = receiver_.get(), due, task = std::move(task)]() mutable {
-    const auto left = std::chrono::ceil<std::chrono::milliseconds>(due - std::chrono::steady_clock::now());
-    QTimer::singleShot(std::max(left, std::chrono::milliseconds(0)), Qt::PreciseTimer, receiver,
-                       [task = std::move(task)]() noexcept { task(); });
-  });
+  const auto due = steady_clock::now() + delay;
+  async([receiver = receiver_.get(), due, task = std::move(task)]() mutable { runAt(due, receiver, std::move(task)); });
 }
 
 bool QtQueue::isCurrent() const {
