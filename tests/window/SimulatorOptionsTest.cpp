@@ -1,12 +1,23 @@
+#include <cstdint>
+#include <fstream>
 #include <string>
+#include <utility>
 #include <vector>
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "hosts/desktop/SimulatorOptions.h"
+#include "support/TemporaryDirectory.h"
 
 namespace quorl::desktop {
 namespace {
+
+using testing::AllOf;
+using testing::ElementsAre;
+using testing::EndsWith;
+using testing::HasSubstr;
+using testing::StartsWith;
 
 tl::expected<SimulatorOptions, int> parsed(std::vector<std::string> arguments) {
   arguments.insert(arguments.begin(), "quorl-simulator");
@@ -95,19 +106,83 @@ TEST(SimulatorOptions, AKnownFamilyInAScenarioHasAPast) {
   EXPECT_FALSE(pastOf({"--recording", QUORL_SOURCE_DIR "/resources/recordings/mav.jsonl"}));
 }
 
+TEST(SimulatorOptions, BadLinesAreLeftOutAndTold) {
+  const test::TemporaryDirectory directory;
+  const std::string recording = (directory.path() / "way.jsonl").string();
+  const std::string script = (directory.path() / "sims.jsonl").string();
+  std::ofstream(recording) << "{\"kKeyMetricID\":806915}\nno json\n{\"atMs\":-1}\n{\"atMs\":5}\n";
+  std::ofstream(script) << "{\"atMs\": 0, \"event\": \"nothing\"}\n"
+                           "{\"atMs\": 0, \"event\": \"simRemoved\", \"slot\": 1}\n";
+  const Programme programme = programmeOf({"--recording", recording, "--telephony", script});
+  EXPECT_EQ(programme.events.size(), 2U);
+  ASSERT_TRUE(programme.telephony);
+  EXPECT_EQ(programme.telephony->size(), 1U);
+  EXPECT_THAT(programme.faults,
+              ElementsAre(recording + ":2: not JSON", StartsWith(recording + ":3: "), StartsWith(script + ":1: ")));
+}
+
+TEST(SimulatorOptions, AFileThatCannotBeReadIsNoProgramme) {
+  for (const char* option : {"--scenario", "--recording", "--telephony"}) {
+    const std::string unreadable = "/proc/self/mem";
+    const auto options = parsed({option, unreadable});
+    ASSERT_TRUE(options);
+    const auto programme = options->programme();
+    ASSERT_FALSE(programme) << option;
+    EXPECT_THAT(programme.error(), StartsWith(unreadable + ":"));
+  }
+}
+
+/// What is said of a command line that is not taken.
+std::string refusal(const std::vector<std::string>& arguments) {
+  testing::internal::CaptureStderr();
+  const auto refused = parsed(arguments);
+  std::string told = testing::internal::GetCapturedStderr();
+  EXPECT_EQ(refused ? 0 : refused.error(), 2) << arguments.back();
+  return told;
+}
+
 TEST(SimulatorOptions, MistakesAreTold) {
-  const auto options = parsed({"--scenario", "moon"});
-  ASSERT_TRUE(options);
-  EXPECT_FALSE(options->programme());
+  constexpr char kSeeHelp[] = " (see quorl-simulator --help)\n";
   for (const auto& wrong : std::vector<std::vector<std::string>>{{"--sims", "3"},
-                                                                 {"--speed", "0"},
+                                                                 {"--scenario", "moon"},
                                                                  {"--recording", "/no/such/file"},
                                                                  {"--history-days", "32"},
-                                                                 {"--wrong"}}) {
-    const auto refused = parsed(wrong);
-    ASSERT_FALSE(refused) << wrong.front();
-    EXPECT_NE(refused.error(), 0);
-  }
+                                                                 {"--wrong"},
+                                                                 {"--seconds"}})
+    EXPECT_THAT(refusal(wrong), AllOf(StartsWith("quorl-simulator: "), HasSubstr(wrong.front()), EndsWith(kSeeHelp)));
+  EXPECT_EQ(refusal({"--seconds", "-1"}),
+            std::string("quorl-simulator: --seconds: -1 is no number above 0") + kSeeHelp);
+  EXPECT_EQ(refusal({"--speed", "0"}),
+            std::string("quorl-simulator: --speed: 0 is no number from 0.01 to 1000") + kSeeHelp);
+}
+
+TEST(SimulatorOptions, NumbersAreFiniteAndWithinTheirLimits) {
+  for (const char* seconds : {"nan", "inf", "0", "-0.5", "1e999", "5s", ""}) refusal({"--seconds", seconds});
+  for (const char* speed : {"nan", "-nan", "inf", "0.009", "1001", "fast"}) refusal({"--speed", speed});
+  for (const char* seed : {"-1", "1.5", "18446744073709551616"}) refusal({"--seed", seed});
+  EXPECT_EQ(parsed({"--seconds", "1e-3"})->seconds, 0.001);
+  EXPECT_EQ(parsed({"--speed", "1000"})->speed, 1000);
+  EXPECT_EQ(parsed({"--seed", "18446744073709551615"})->seed, UINT64_MAX);
+}
+
+/// What a console prints to standard output and to standard error.
+std::pair<std::string, std::string> printedBy(const std::vector<std::string>& arguments) {
+  const auto console = parsed(arguments)->console();
+  testing::internal::CaptureStdout();
+  testing::internal::CaptureStderr();
+  console->print("a line");
+  std::string output = testing::internal::GetCapturedStdout();
+  return {std::move(output), testing::internal::GetCapturedStderr()};
+}
+
+TEST(SimulatorOptions, TheProductsPrintsGoWhereNoResultsAre) {
+  const auto pair = [](std::string output, std::string errors) {
+    return std::pair(std::move(output), std::move(errors));
+  };
+  EXPECT_EQ(printedBy({}), pair("a line\n", ""));
+  EXPECT_EQ(printedBy({"--verbose"}), pair("a line\n", ""));
+  EXPECT_EQ(printedBy({"--print"}), pair("", ""));
+  EXPECT_EQ(printedBy({"--print", "--verbose"}), pair("", "a line\n"));
 }
 
 }  // namespace

@@ -2,6 +2,7 @@
 
 #include <filesystem>
 #include <optional>
+#include <string>
 #include <vector>
 
 #include "hosts/simulator/Recording.h"
@@ -18,6 +19,7 @@ struct Programme {
   std::optional<std::vector<simulator::TelephonyScriptStep>> telephony;
   double speed = 1;                               // above 0
   std::optional<std::filesystem::path> record{};  // what the scenario delivers is written there
+  std::vector<std::string> faults{};              // lines of the files that were left out, for the user
 };
 
 }  // namespace quorl::desktop

@@ -2,6 +2,7 @@
 
 #include <QStandardPaths>
 #include <algorithm>
+#include <memory>
 #include <utility>
 #include <variant>
 #include <vector>
@@ -10,7 +11,9 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include "hosts/desktop/NumberChecks.h"
 #include "hosts/desktop/PlayedRadio.h"
+#include "hosts/desktop/Tell.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/ScenarioFiles.h"
 #include "hosts/simulator/TelephonyScript.h"
@@ -74,6 +77,13 @@ std::optional<Family> familyOf(const simulator::DeviceDescription& device) {
   return std::nullopt;
 }
 
+/// What is wrong with a name that no scenario has; empty for any other, and for the path of a file.
+std::string faultOfScenario(const std::string& name) {
+  if (simulator::isScenario(name, resources())) return {};
+  const auto found = simulator::findScenario(name, resources());
+  return found ? std::string() : joined(found.error(), "\n");
+}
+
 tl::expected<simulator::ScenarioChoice, std::string> scenarioOf(const SimulatorOptions& options) {
   auto scenario = simulator::findScenario(options.scenario.empty() ? kUsualScenario : options.scenario, resources());
   if (!scenario) return tl::unexpected(joined(scenario.error(), "\n"));
@@ -84,20 +94,25 @@ tl::expected<simulator::ScenarioChoice, std::string> scenarioOf(const SimulatorO
   return simulator::ScenarioChoice{*std::move(scenario), options.seed, familyOf(options.device).value_or(Family::Mav)};
 }
 
-tl::expected<std::vector<simulator::RecordedEvent>, std::string> recordingOf(const std::filesystem::path& file) {
+tl::expected<std::vector<simulator::RecordedEvent>, std::string> recordingOf(const std::filesystem::path& file,
+                                                                             std::vector<std::string>& faults) {
   auto read = simulator::readRecording(file);
   if (!read) return tl::unexpected(fmt::format("{}: {}", file.string(), read.error()));
-  if (!read->faults.empty())
-    return tl::unexpected(
-        fmt::format("{}:{}: {}", file.string(), read->faults.front().line, read->faults.front().reason));
+  for (const auto& fault : read->faults)
+    faults.push_back(fmt::format("{}:{}: {}", file.string(), fault.line, fault.reason));
   return std::move(read->events);
 }
 
-tl::expected<PlayedRadio::Steps, std::string> scriptOf(const SimulatorOptions& options) {
+tl::expected<PlayedRadio::Steps, std::string> scriptOf(const SimulatorOptions& options,
+                                                       std::vector<std::string>& faults) {
   const auto file = options.telephony.empty() ? shipped("telephony/two-sims.jsonl") : std::optional(options.telephony);
   if (!file) return tl::unexpected(std::string("the shipped telephony script is missing; name one with --telephony"));
   simulator::TelephonyScript script = simulator::readTelephonyScript(*file);
-  if (!script.problems.empty()) return tl::unexpected(logText(script.problems.front()));
+  for (simulator::TelephonyScriptProblem& problem : script.problems) {
+    problem.file = file->string();  // as the user has named it
+    if (problem.line == 0) return tl::unexpected(logText(problem));
+    faults.push_back(logText(problem));
+  }
   keepSims(script.steps, options.sims);
   return std::move(script.steps);
 }
@@ -120,8 +135,11 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
       ->check(CLI::Range(0, 2));
   app.add_option("--scenario", options.scenario,
                  fmt::format("Scenario to go through: {}, or a file; the usual one is {}",
-                             joined(simulator::scenarioNames(resources()), ", "), kUsualScenario));
-  app.add_option("--seed", options.seed, "Which of the scenario's runs")->capture_default_str();
+                             joined(simulator::scenarioNames(resources()), ", "), kUsualScenario))
+      ->check(CLI::Validator(faultOfScenario, ""));
+  app.add_option("--seed", options.seed, "Which of the scenario's runs")
+      ->check(CLI::Validator(faultOfSeed, "0 OR MORE"))
+      ->capture_default_str();
   auto* recording =
       app.add_option("--recording", options.recording, "Recording to play over and over in place of a scenario")
           ->check(CLI::ExistingFile)
@@ -135,17 +153,19 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
       ->check(CLI::Range(0, 31))
       ->capture_default_str();
   app.add_option("--speed", options.speed, "How many times as fast as life everything goes")
-      ->check(CLI::Range(0.01, 1000.0))
+      ->check(CLI::Validator([](const std::string& text) { return faultOfNumber(text, 0.01, 1000); }, "0.01 TO 1000"))
       ->capture_default_str();
   app.add_option("--documents", options.documents, "Directory for the database; made if it is missing");
   app.add_flag("--verbose", options.isVerbose, "Show the log on standard error");
   app.add_flag("--print", options.prints, "Print dashboard and metric list as they refresh");
   app.add_option("--screenshots", options.screenshots, "Write pictures of the tabs here before the end");
-  app.add_option("--seconds", options.seconds, "End after this time")->check(CLI::PositiveNumber);
+  app.add_option("--seconds", options.seconds, "End after this time")->check(CLI::Validator(faultOfTime, "ABOVE 0"));
   try {
     app.parse(argc, argv);
   } catch (const CLI::ParseError& error) {
-    return tl::unexpected(app.exit(error));
+    if (error.get_exit_code() == 0) return tl::unexpected(app.exit(error));  // asks for the help
+    tell(std::string(error.what()) + " (see quorl-simulator --help)");
+    return tl::unexpected(kWrongUse);
   }
   if (chipset != kUnknownChipset) options.device.chipset = chipset;
   if (!deviceClass.empty()) options.device.deviceClass = deviceClass;
@@ -165,15 +185,20 @@ tl::expected<Programme, std::string> SimulatorOptions::programme() const {
     programme.scenario = *std::move(chosen);
     if (!record.empty()) programme.record = record;
   } else {
-    auto events = recordingOf(recording);
+    auto events = recordingOf(recording, programme.faults);
     if (!events) return tl::unexpected(std::move(events.error()));
     programme.events = *std::move(events);
   }
   if (recording.empty() && telephony.empty()) return programme;
-  auto steps = scriptOf(*this);
+  auto steps = scriptOf(*this, programme.faults);
   if (!steps) return tl::unexpected(std::move(steps.error()));
   programme.telephony = *std::move(steps);
   return programme;
+}
+
+std::unique_ptr<Console> SimulatorOptions::console() const {
+  if (prints) return std::make_unique<simulator::StandardErrorConsole>(/*isShown=*/isVerbose);
+  return std::make_unique<simulator::StandardOutputConsole>();
 }
 
 std::optional<simulator::HistoryPlan> SimulatorOptions::history(const Programme& programme, Date until) const {
