@@ -3,15 +3,19 @@
 #include <QProcess>
 #include <QProcessEnvironment>
 #include <algorithm>
+#include <cstdint>
 #include <filesystem>
+#include <fstream>
 #include <string>
 #include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include "hosts/simulator/Recording.h"
 #include "store/RawDatabase.h"
+#include "support/FileSizeLimit.h"
 #include "support/TemporaryDirectory.h"
 
 namespace quorl::test {
@@ -25,6 +29,7 @@ class SimulatorProgram : public ::testing::Test {
   struct Ended {
     int code = -1;
     std::string errors;
+    std::string output = {};  // what was not waited for
   };
 
   void start(const std::vector<std::string>& options) {
@@ -50,7 +55,32 @@ class SimulatorProgram : public ::testing::Test {
   Ended end() {
     EXPECT_TRUE(process.waitForFinished(kLongestRunMs));
     return {process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1,
-            process.readAllStandardError().toStdString()};
+            process.readAllStandardError().toStdString(), process.readAllStandardOutput().toStdString()};
+  }
+  /// Waits while the program runs.
+  template <typename Condition>
+  bool waitsUntil(Condition condition) {
+    constexpr int kLookMs = 10;
+    for (int waited = 0; waited < kLongestRunMs && process.state() != QProcess::NotRunning; waited += kLookMs) {
+      if (condition()) return true;
+      process.waitForFinished(kLookMs);
+    }
+    return condition();
+  }
+  std::vector<std::string> documentNames() const {
+    std::vector<std::string> names;
+    for (const auto& entry : std::filesystem::directory_iterator(documents)) names.push_back(entry.path().filename());
+    return names;
+  }
+  /// Starts on a month of history, and waits until it is being written.
+  bool startsHistory() {
+    start({"--history-days", "31", "--seconds", "0.1"});
+    return waitsUntil([this] {
+      if (!std::filesystem::exists(documents)) return false;
+      const auto names = documentNames();
+      return std::any_of(names.begin(), names.end(),
+                         [](const auto& name) { return name.starts_with(".quorl-history-"); });
+    });
   }
   Ended run(const std::vector<std::string>& options) {
     start(options);
@@ -103,11 +133,14 @@ TEST_F(SimulatorProgram, EndsWholeWhenItIsAskedTo) {
 
 TEST_F(SimulatorProgram, ATypingMistakeIsToldInALine) {
   const Ended scenario = run({"--scenario", "moon"});
-  EXPECT_EQ(scenario.code, 1);
+  EXPECT_EQ(scenario.code, 2);
   EXPECT_THAT(scenario.errors, StartsWith("quorl-simulator: "));
   EXPECT_THAT(scenario.errors, HasSubstr("moon"));
   EXPECT_FALSE(std::filesystem::exists(database));
-  EXPECT_NE(run({"--scenario", "city", "--recording", QUORL_SOURCE_DIR "/resources/recordings/mav.jsonl"}).code, 0);
+  const Ended both = run({"--scenario", "city", "--recording", QUORL_SOURCE_DIR "/resources/recordings/mav.jsonl"});
+  EXPECT_EQ(both.code, 2);
+  EXPECT_THAT(both.errors, StartsWith("quorl-simulator: "));
+  EXPECT_FALSE(std::filesystem::exists(documents)) << "nothing was tried";
   const Ended record = run({"--history-days", "0", "--record", "/no/such/folder/way.jsonl"});
   EXPECT_EQ(record.code, 1);
   EXPECT_EQ(record.errors, "quorl-simulator: /no/such/folder/way.jsonl: No such file or directory\n");
@@ -126,6 +159,175 @@ TEST_F(SimulatorProgram, PlaysARecordingBesideATelephonyScript) {
   EXPECT_EQ(ended.errors, "");
   EXPECT_GT(std::stoi(single("SELECT count(*) FROM Metric WHERE metric_tech = 'RAT'")), 0);
   EXPECT_GT(std::stoi(single("SELECT count(*) FROM Metric WHERE metric_tech <> 'RAT'")), 0);
+}
+
+TEST_F(SimulatorProgram, AHistoryThatWasCutShortIsMadeAgain) {
+  ASSERT_TRUE(startsHistory());
+  process.kill();
+  end();
+  EXPECT_FALSE(std::filesystem::exists(database)) << "nobody takes the half for the whole";
+  EXPECT_EQ(documentNames().size(), 1U);
+  const Ended again = run({"--history-days", "1", "--seconds", "0.1"});
+  EXPECT_EQ(again.code, 0);
+  EXPECT_THAT(again.errors, StartsWith("quorl-simulator: a history of "));
+  for (const std::string& name : documentNames()) EXPECT_THAT(name, StartsWith("metricPartV11.sqlite"));
+}
+
+TEST_F(SimulatorProgram, ASignalEndsItWithinTheHistory) {
+  ASSERT_TRUE(startsHistory());
+  process.terminate();
+  const Ended ended = end();
+  EXPECT_EQ(ended.code, 0);
+  EXPECT_EQ(ended.errors, "");
+  EXPECT_THAT(documentNames(), testing::IsEmpty());
+}
+
+TEST_F(SimulatorProgram, AHistoryThatDoesNotFitIsToldAndLeavesNothing) {
+  {
+    const FileSizeLimit limit(128 * 1024);  // goes on to the program
+    start({"--history-days", "1", "--seconds", "0.1"});
+  }
+  const Ended ended = end();
+  EXPECT_EQ(ended.code, 1);
+  EXPECT_THAT(ended.errors, StartsWith("quorl-simulator: " + database.string() + ": "));
+  EXPECT_THAT(documentNames(), testing::IsEmpty());
+}
+
+TEST_F(SimulatorProgram, RowsThatCouldNotBeStoredAreToldAtOnceAndInTheEnd) {
+  run({"--history-days", "0", "--seconds", "0.1"});
+  RawDatabase other(database);
+  other.run("BEGIN IMMEDIATE");
+  start({});
+  std::string errors;
+  EXPECT_TRUE(waitsUntil([&] {
+    errors += process.readAllStandardError().toStdString();
+    return errors.ends_with('\n');
+  }));
+  EXPECT_EQ(errors, "quorl-simulator: 1 row could not be stored: database is locked\n");
+  process.terminate();
+  const Ended ended = end();
+  EXPECT_EQ(ended.code, 1);
+  EXPECT_THAT(ended.errors,
+              testing::MatchesRegex("quorl-simulator: [0-9]+ rows could not be stored: database is locked\n"));
+}
+
+TEST_F(SimulatorProgram, UnusableDocumentsAreToldInALine) {
+  std::ofstream(documents) << "a file";
+  const Ended ended = run({"--seconds", "0.1"});
+  EXPECT_EQ(ended.code, 1);
+  EXPECT_EQ(ended.errors, "quorl-simulator: " + documents.string() + ": Not a directory\n");
+}
+
+TEST_F(SimulatorProgram, EndsWhileItWaitsForTheReaderOfItsRecording) {
+  const auto pipe = directory.path() / "pipe";
+  ASSERT_EQ(::mkfifo(pipe.c_str(), S_IRUSR | S_IWUSR), 0);
+  start({"--history-days", "0", "--record", pipe.string()});
+  ASSERT_TRUE(waitsUntil([this] { return std::filesystem::exists(documents); }));
+  process.terminate();
+  const Ended ended = end();
+  EXPECT_EQ(ended.errors, "");
+  EXPECT_FALSE(std::filesystem::exists(database)) << "the product was not started";
+}
+
+TEST_F(SimulatorProgram, RecordsIntoAPipeOnceItIsRead) {
+  const auto pipe = directory.path() / "pipe";
+  const auto copy = directory.path() / "copy.jsonl";
+  ASSERT_EQ(::mkfifo(pipe.c_str(), S_IRUSR | S_IWUSR), 0);
+  start({"--history-days", "0", "--record", pipe.string(), "--seconds", "1"});
+  ASSERT_TRUE(waitsUntil([this] { return std::filesystem::exists(documents); }));
+  QProcess reader;
+  reader.setStandardOutputFile(QString::fromStdString(copy.string()));
+  reader.start("cat", {QString::fromStdString(pipe.string())});
+  const Ended ended = end();
+  EXPECT_EQ(ended.code, 0) << ended.errors;
+  ASSERT_TRUE(reader.waitForFinished(kLongestRunMs));
+  const auto read = simulator::readRecording(copy);
+  ASSERT_TRUE(read);
+  EXPECT_FALSE(read->events.empty());
+  EXPECT_TRUE(read->faults.empty());
+}
+
+TEST_F(SimulatorProgram, EndsWholeWhenNobodyReadsWhatItPrints) {
+  const auto recording = directory.path() / "way.jsonl";
+  QProcess head;
+  process.setStandardOutputProcess(&head);
+  start({"--history-days", "0", "--print", "--record", recording.string()});
+  head.start("head", {"-1"});
+  ASSERT_TRUE(head.waitForFinished(kLongestRunMs));
+  EXPECT_THAT(head.readAllStandardOutput().toStdString(), StartsWith("Dashboard"));
+  const Ended ended = end();
+  EXPECT_EQ(ended.code, 1);
+  EXPECT_EQ(ended.errors, "quorl-simulator: standard output cannot be written\n");
+  const auto read = simulator::readRecording(recording);
+  ASSERT_TRUE(read);
+  EXPECT_FALSE(read->events.empty());
+  EXPECT_TRUE(read->faults.empty());
+}
+
+TEST_F(SimulatorProgram, TellsWhenItCannotPrint) {
+  process.setStandardOutputFile("/dev/full");
+  const Ended ended = run({"--history-days", "0", "--print"});
+  EXPECT_EQ(ended.code, 1);
+  EXPECT_EQ(ended.errors, "quorl-simulator: standard output cannot be written\n");
+}
+
+TEST_F(SimulatorProgram, TakesPicturesWhenItIsAskedToEnd) {
+  const auto pictures = directory.path() / "pictures";
+  start({"--history-days", "0", "--screenshots", pictures.string()});
+  ASSERT_TRUE(waitsForOutput("measurements ")) << "what the product prints is shown";
+  process.terminate();
+  const Ended ended = end();
+  EXPECT_EQ(ended.code, 0);
+  EXPECT_EQ(ended.errors, "");
+  EXPECT_GT(std::filesystem::file_size(pictures / "DashboardViewController.png"), 0U);
+}
+
+TEST_F(SimulatorProgram, TellsOfEachPictureThatCannotBeWritten) {
+  const auto picture = directory.path() / "DashboardViewController.png";
+  std::filesystem::create_directory(picture);
+  const Ended ended =
+      run({"--history-days", "0", "--screenshots", directory.path().string(), "--seconds", "0.1", "--print"});
+  EXPECT_EQ(ended.code, 1);
+  EXPECT_THAT(ended.errors, StartsWith("quorl-simulator: " + picture.string() + ": "));
+  EXPECT_THAT(ended.output, testing::Not(HasSubstr("measurements "))) << "standard output is for results";
+}
+
+TEST_F(SimulatorProgram, ShowsNoControlCharacters) {
+  run({"--history-days", "0", "--seconds", "0.1"});
+  RawDatabase(database).run(
+      "INSERT INTO Metric (metric_tech, metric_name, attribute_name, attribute_value, attribute_value_type,"
+      " is_attribute_graphable, metric_id, subs_id, collected_on)"
+      " SELECT 'LTE', 'sly ' || char(27) || '[31m', 'a', '1', 'INT', 0, '1', column1, datetime('now')"
+      " FROM (VALUES (0), (1))");
+  start({"--print"});
+  EXPECT_TRUE(waitsForOutput("sly .[31m")) << output;
+  process.terminate();
+  end();
+  EXPECT_THAT(run({"--scenario", "sly \033[31m"}).errors, HasSubstr("\"sly .[31m\""));
+}
+
+TEST_F(SimulatorProgram, WhatIsAMonthAwayDoesNotComeAtOnce) {
+  const auto recording = directory.path() / "way.jsonl";
+  const auto script = directory.path() / "sims.jsonl";
+  const auto shipped =
+      simulator::readRecording(std::filesystem::path(QUORL_SOURCE_DIR "/resources/recordings/mav.jsonl"));
+  ASSERT_TRUE(shipped);
+  simulator::RecordedEvent far = shipped->events.front();
+  std::ofstream lines(recording);
+  for (const std::uint64_t atMs : {std::uint64_t{2200000000}, std::uint64_t{2592000000000}, UINT64_MAX}) {
+    far.atMs = atMs;
+    lines << simulator::recordingLine(far) << '\n';
+  }
+  lines.close();
+  std::ofstream(script) << "{\"atMs\": 0, \"event\": \"simInserted\", \"slot\": 1}\n"
+                           "{\"atMs\": 2592000000, \"event\": \"simRemoved\", \"slot\": 1}\n";
+  start({"--recording", recording.string(), "--telephony", script.string(), "--seconds", "2500000"});
+  ASSERT_TRUE(waitsForOutput("measurements "));
+  process.terminate();
+  const Ended ended = end();
+  EXPECT_EQ(ended.code, 0);
+  EXPECT_EQ(ended.errors, "") << "no timer overflows";
+  EXPECT_EQ(single("SELECT count(*) FROM Metric WHERE metric_tech <> 'RAT'"), "0");
 }
 
 }  // namespace

@@ -1,10 +1,11 @@
 #include "hosts/desktop/QuitOnSignal.h"
 
-#include <QCoreApplication>
 #include <array>
 #include <csignal>
+#include <utility>
 
 #include <fcntl.h>
+#include <poll.h>
 #include <unistd.h>
 
 namespace quorl::desktop {
@@ -20,26 +21,43 @@ void wake(int /*signal*/) {
   [[maybe_unused]] const ssize_t written = write(ends[1], &byte, 1);
 }
 
+void replaceHandler(int signal, void (*from)(int), void (*to)(int)) {
+  struct sigaction action {};
+  if (sigaction(signal, nullptr, &action) != 0 || action.sa_handler != from) return;
+  action = {};
+  action.sa_handler = to;
+  action.sa_flags = static_cast<int>(SA_RESETHAND | SA_RESTART);
+  sigaction(signal, &action, nullptr);
+}
+
 }  // namespace
 
 QuitOnSignal::QuitOnSignal() {
   if (pipe2(ends.data(), O_CLOEXEC | O_NONBLOCK) != 0) return;
-  notifier_ = std::make_unique<QSocketNotifier>(ends[0], QSocketNotifier::Read);
-  QObject::connect(notifier_.get(), &QSocketNotifier::activated, [] { QCoreApplication::quit(); });
-  struct sigaction action {};
-  action.sa_handler = wake;
-  action.sa_flags = static_cast<int>(SA_RESETHAND | SA_RESTART);
-  for (const int signal : kSignals) sigaction(signal, &action, nullptr);
+  for (const int signal : kSignals) replaceHandler(signal, SIG_DFL, wake);
 }
 
 QuitOnSignal::~QuitOnSignal() {
-  if (!notifier_) return;
-  for (const int signal : kSignals) std::signal(signal, SIG_DFL);
+  for (const int signal : kSignals) replaceHandler(signal, wake, SIG_DFL);
   notifier_.reset();
   for (int& end : ends) {
-    close(end);
+    if (end >= 0) close(end);
     end = -1;
   }
+}
+
+bool QuitOnSignal::isAsked(std::chrono::milliseconds within) const {
+  pollfd wish{ends[0], POLLIN, 0};
+  return poll(&wish, 1, static_cast<int>(within.count())) > 0;
+}
+
+void QuitOnSignal::whenAsked(std::function<void()> end) {
+  if (ends[0] < 0) return;
+  notifier_ = std::make_unique<QSocketNotifier>(ends[0], QSocketNotifier::Read);
+  QObject::connect(notifier_.get(), &QSocketNotifier::activated, [notifier = notifier_.get(), end = std::move(end)] {
+    notifier->setEnabled(false);
+    end();
+  });
 }
 
 }  // namespace quorl::desktop

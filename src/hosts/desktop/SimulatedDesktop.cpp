@@ -17,9 +17,14 @@ namespace {
 constexpr std::size_t kMostTasks = 400;
 constexpr std::chrono::seconds kLongestRest{2};
 
+std::unique_ptr<Console> orSilent(std::unique_ptr<Console> console) {
+  return console ? std::move(console) : std::make_unique<simulator::StandardErrorConsole>(/*isShown=*/false);
+}
+
 }  // namespace
 
-SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents)
+SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents,
+                                   std::unique_ptr<Console> console)
     : activity_(std::make_shared<simulator::Activity>([] {})),
       queues_(activity_),
       mainQueue_(std::make_shared<QtQueue>("main"), activity_),
@@ -29,11 +34,11 @@ SimulatedDesktop::SimulatedDesktop(simulator::DeviceDescription device, const st
       resources_(resourceFolders_),
       documents_(documents),
       strings_(resourceFolders_),
-      console_(/*isShown=*/false),
+      console_(orSilent(std::move(console))),
       telephony_(queues_),
       sondrel_(simulator::SondrelSimulator::ofPhone(documents, log_), mainQueue_, queues_, clock_),
       platform_{mainQueue_,  *backgroundQueue_, queues_,    clock_,   device_,    resources_,
-                documents_,  strings_,          console_,   alerts_,  analytics_, view::SaveText::shared(),
+                documents_,  strings_,          *console_,  alerts_,  analytics_, view::SaveText::shared(),
                 pasteboard_, baseband_,         telephony_, &sondrel_} {
   Platform::install(&platform_);
 }

@@ -29,8 +29,10 @@ namespace quorl::desktop {
 /// The product's process-wide objects refer to it, so it has to outlive all of them; a program keeps it to its end.
 class SimulatedDesktop {
  public:
-  /// Installs itself as the process's platform. There is no radio yet, and no SIM.
-  SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents);
+  /// Installs itself as the process's platform. There is no radio yet, and no SIM. What the product prints goes to
+  /// `console`, or nowhere.
+  SimulatedDesktop(simulator::DeviceDescription device, const std::filesystem::path& documents,
+                   std::unique_ptr<Console> console = nullptr);
   ~SimulatedDesktop();
   SimulatedDesktop(const SimulatedDesktop&) = delete;
   SimulatedDesktop& operator=(const SimulatedDesktop&) = delete;
@@ -62,7 +64,7 @@ class SimulatedDesktop {
   simulator::ResourceDirectories resources_;
   simulator::FixedDocumentsDirectory documents_;
   simulator::GettextStrings strings_;
-  simulator::StandardErrorConsole console_;
+  const std::unique_ptr<Console> console_;
   view::AlertsBinding alerts_;
   simulator::LoggedAnalytics analytics_;
   QtPasteboard pasteboard_;

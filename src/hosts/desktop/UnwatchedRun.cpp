@@ -1,13 +1,19 @@
 #include "hosts/desktop/UnwatchedRun.h"
 
 #include <QCoreApplication>
+#include <QEvent>
 #include <QImage>
 #include <QQuickWindow>
+#include <QSaveFile>
 #include <chrono>
 #include <iostream>
+#include <system_error>
+#include <utility>
 
 #include <fmt/format.h>
 
+#include "base/PrintableText.h"
+#include "hosts/desktop/Tell.h"
 #include "shell/BaseViewController.h"
 #include "shell/view/QtText.h"
 #include "shell/view/ShellBinding.h"
@@ -23,27 +29,29 @@ constexpr auto kLook = 1s;
 constexpr auto kTabTime = 1500ms;
 
 std::string dashboardText(DashboardViewController& dashboard) {
-  std::string text = dashboard.lastRefreshedText() + "\n";
+  std::string text = printable(dashboard.lastRefreshedText()) + "\n";
   for (const DashboardViewModelObject& row : dashboard.viewModel()->metrics())
-    text += fmt::format("  {:<40} {:>24}\n", dashboardNameText(row), dashboardValueText(row));
+    text += fmt::format("  {:<40} {:>24}\n", printable(dashboardNameText(row)), printable(dashboardValueText(row)));
   return text;
 }
 
 std::string listText(AllMetricsViewController& list) {
   std::string text;
   for (const AllMetricsDataSource& group : list.table()) {
-    text += group.metricTech + "\n";
+    text += printable(group.metricTech) + "\n";
     for (const AllMetricsRowItem& row : group.rowItems)
-      text += fmt::format("  {:<40} {:>24}\n", AllMetricsViewController::nameText(row),
-                          AllMetricsViewController::timeText(row));
+      text += fmt::format("  {:<40} {:>24}\n", printable(AllMetricsViewController::nameText(row)),
+                          printable(AllMetricsViewController::timeText(row)));
   }
   return text;
 }
 
 }  // namespace
 
-UnwatchedRun::UnwatchedRun(QQuickWindow& window, view::ShellBinding& shell, BaseViewController& base)
-    : window_(window), shell_(shell), base_(base) {
+UnwatchedRun::UnwatchedRun(QQuickWindow& window, view::ShellBinding& shell, BaseViewController& base,
+                           std::filesystem::path pictures)
+    : window_(window), shell_(shell), base_(base), folder_(std::move(pictures)) {
+  window_.installEventFilter(this);
   QObject::connect(&printing_, &QTimer::timeout, this, [this] { print(); });
 }
 
@@ -58,13 +66,36 @@ void UnwatchedRun::print() {
   if (text == printed_) return;
   printed_ = std::move(text);
   std::cout << printed_ << std::endl;
+  if (std::cout) return;
+  // Whoever read it has gone, as a rule: what ends a pipe's other programs at once ends this one whole.
+  printing_.stop();
+  fail("standard output cannot be written");
+  end();
 }
 
-void UnwatchedRun::takePictures(const std::filesystem::path& folder) {
-  folder_ = folder;
+void UnwatchedRun::fail(const std::string& text) {
+  hasFailed_ = true;
+  tell(text);
+}
+
+void UnwatchedRun::end() {
+  if (isEnding_) return;
+  isEnding_ = true;
   std::error_code error;
-  std::filesystem::create_directories(folder_, error);
-  takePicture();
+  if (!folder_.empty()) std::filesystem::create_directories(folder_, error);
+  if (error) fail(folder_.string() + ": " + error.message());
+  if (!folder_.empty() && !error) return takePicture();
+  // The event loop may not run yet.
+  QMetaObject::invokeMethod(QCoreApplication::instance(), &QCoreApplication::quit, Qt::QueuedConnection);
+}
+
+bool UnwatchedRun::eventFilter(QObject* object, QEvent* event) {
+  // A closed window shows nothing to take pictures of. Closed once more, it is left at that.
+  if (object != &window_ || event->type() != QEvent::Close || folder_.empty() || isEnding_)
+    return QObject::eventFilter(object, event);
+  event->ignore();
+  end();
+  return true;
 }
 
 void UnwatchedRun::takePicture() {
@@ -74,12 +105,16 @@ void UnwatchedRun::takePicture() {
   }
   shell_.menuBar()->press(nextPicture_);
   QTimer::singleShot(kTabTime, this, [this] {
-    const QString file =
-        view::toQt((folder_ / (view::fromQt(shell_.screenNames().at(nextPicture_)) + ".png")).string());
-    if (!window_.grabWindow().save(file)) std::cerr << view::fromQt(file) << " could not be written\n";
+    savePicture(folder_ / (view::fromQt(shell_.screenNames().at(nextPicture_)) + ".png"));
     ++nextPicture_;
     takePicture();
   });
+}
+
+void UnwatchedRun::savePicture(const std::filesystem::path& file) {
+  QSaveFile output(view::toQt(file.string()));
+  if (output.open(QIODevice::WriteOnly) && window_.grabWindow().save(&output, "PNG") && output.commit()) return;
+  fail(file.string() + ": " + view::fromQt(output.errorString()));
 }
 
 }  // namespace quorl::desktop

@@ -3,9 +3,10 @@
 #include <QGuiApplication>
 #include <QQmlApplicationEngine>
 #include <QQuickWindow>
-#include <QTimer>
+#include <algorithm>
 #include <chrono>
 #include <clocale>
+#include <csignal>
 #include <cstdlib>
 #include <filesystem>
 #include <iostream>
@@ -15,16 +16,22 @@
 #include <system_error>
 #include <utility>
 
+#include <fmt/format.h>
 #include <spdlog/sinks/stdout_color_sinks.h>
 
 #include "app/AppDelegate.h"
 #include "base/SpdlogSink.h"
 #include "hosts/desktop/Lifecycle.h"
+#include "hosts/desktop/LostRows.h"
+#include "hosts/desktop/QtQueue.h"
 #include "hosts/desktop/QuitOnSignal.h"
+#include "hosts/desktop/RecordPipe.h"
 #include "hosts/desktop/SimulatedDesktop.h"
 #include "hosts/desktop/SimulatorOptions.h"
 #include "hosts/desktop/SystemAppearance.h"
+#include "hosts/desktop/Tell.h"
 #include "hosts/desktop/UnwatchedRun.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "shell/BaseViewController.h"
 #include "shell/LogCategories.h"
 #include "shell/view/QmlModule.h"
@@ -39,6 +46,7 @@ using desktop::SimulatorOptions;
 constexpr char kTabletClass[] = "Tabrin";
 constexpr QSize kPhone{390, 844};
 constexpr QSize kTablet{1024, 768};
+constexpr double kLongestSeconds = 3e9;  // a clock counts no further than three times that
 
 /// A system that has no language, such as a bare container, reads the English string table rather than raw names.
 void readEnglishWithoutALanguage() {
@@ -49,30 +57,40 @@ void readEnglishWithoutALanguage() {
 }
 
 int fail(const std::string& text) {
-  std::cerr << "quorl-simulator: " << text << '\n';
+  desktop::tell(text);
   return EXIT_FAILURE;
 }
 
 /// Gives a phone without a database the history that was asked for. The error is a line for the user.
-tl::expected<void, std::string> makeHistory(const SimulatorOptions& options, const desktop::Programme& programme) {
+tl::expected<void, std::string> makeHistory(const SimulatorOptions& options, const desktop::Programme& programme,
+                                            const desktop::QuitOnSignal& quitting) {
   const std::optional<std::string> file = databasePath();
+  if (!file) return {};
+  simulator::removeAbandonedHistories(*file);
   std::error_code ignored;
-  if (!file || std::filesystem::exists(*file, ignored)) return {};
+  if (std::filesystem::exists(*file, ignored)) return {};
   const auto plan = options.history(programme, SystemClock().now());
   if (!plan) return {};
-  const auto made = simulator::writeHistory(*file, *plan, {});
+  const auto made = simulator::writeHistory(*file, *plan, {}, [&quitting] { return quitting.isAsked(); });
   if (!made) return tl::unexpected(made.error());
-  std::cerr << "quorl-simulator: a history of " << made->rows << " rows over " << plan->days << " days is in " << *file
-            << '\n';
+  desktop::tell(fmt::format("a history of {} rows over {} days is in {}", made->rows, plan->days, *file));
   return {};
 }
 
 int run(QGuiApplication& application, const SimulatorOptions& options) {
   auto programme = options.programme();
   if (!programme) return fail(programme.error());
+  for (const std::string& fault : programme->faults) desktop::tell(fault);
+  if (const auto usable = simulator::prepareDocuments(options.documents); !usable) return fail(usable.error());
+  // From here on there is something to leave whole; before, a signal ends the program as usual.
+  desktop::QuitOnSignal quitting;
   // The product has no tear-down: what is made here lives until the process ends.
-  static auto* phone = new desktop::SimulatedDesktop(options.device, options.documents);
-  if (const auto made = makeHistory(options, *programme); !made) return fail(made.error());
+  static auto* phone = new desktop::SimulatedDesktop(options.device, options.documents, options.console());
+  const auto made = makeHistory(options, *programme, quitting);
+  if (quitting.isAsked()) return EXIT_SUCCESS;
+  if (!made) return fail(made.error());
+  const auto reader = desktop::awaitReader(options.record, quitting);
+  if (quitting.isAsked()) return EXIT_SUCCESS;
   if (const auto ready = phone->tuneIn(*std::move(programme)); !ready) return fail(ready.error());
   static auto* product = new AppDelegate;
   desktop::Lifecycle lifecycle(*product);
@@ -92,22 +110,20 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
   if (window == nullptr) return EXIT_FAILURE;
   phone->startRadio();
 
-  desktop::UnwatchedRun unwatched(*window, shell, *product->window()->rootViewController()->rootScreen());
+  desktop::UnwatchedRun unwatched(*window, shell, *product->window()->rootViewController()->rootScreen(),
+                                  options.screenshots);
+  quitting.whenAsked([&unwatched] { unwatched.end(); });
   if (options.prints) unwatched.printChanges();
+  desktop::QtQueue ending("end");
   if (options.seconds) {
-    const std::chrono::duration<double> time(*options.seconds);
-    QTimer::singleShot(std::chrono::duration_cast<std::chrono::milliseconds>(time), &unwatched, [&] {
-      if (options.screenshots.empty())
-        QCoreApplication::quit();
-      else
-        unwatched.takePictures(options.screenshots);
-    });
+    const std::chrono::duration<double> time(std::min(*options.seconds, kLongestSeconds));
+    ending.asyncAfter(std::chrono::duration_cast<Queue::Duration>(time), [&unwatched] { unwatched.end(); });
   }
   const int code = application.exec();
   lifecycle.terminate();
   if (const auto whole = phone->stopRadio(); !whole && !options.record.empty())
     return fail(options.record.string() + ": " + whole.error());
-  return code;
+  return unwatched.hasFailed() ? EXIT_FAILURE : code;
 }
 
 }  // namespace
@@ -116,16 +132,21 @@ int main(int argc, char** argv) {
   QCoreApplication::setApplicationName("quorl-simulator");
   const auto options = SimulatorOptions::parse(argc, argv);
   if (!options) return options.error();
+  std::shared_ptr<LogSink> shownLog;
   if (options->isVerbose)
-    installLogSink(std::make_shared<SpdlogSink>(log_category::kFallbackSubsystem,
-                                                std::make_shared<spdlog::sinks::stderr_color_sink_mt>()));
+    shownLog = std::make_shared<SpdlogSink>(log_category::kFallbackSubsystem,
+                                            std::make_shared<spdlog::sinks::stderr_color_sink_mt>());
+  const auto lostRows = std::make_shared<desktop::LostRows>(std::move(shownLog));
+  installLogSink(lostRows);
+  // Who reads what is printed or recorded may go; that is told where it is written.
+  std::signal(SIGPIPE, SIG_IGN);
   int code = EXIT_FAILURE;
   {
     QGuiApplication application(argc, argv);
     readEnglishWithoutALanguage();
-    const desktop::QuitOnSignal quitting;
     code = run(application, *options);
   }
+  if (lostRows->tellAll() && code == EXIT_SUCCESS) code = EXIT_FAILURE;
   // Threads of the product still live.
   std::cout.flush();
   std::_Exit(code);
