@@ -12,6 +12,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include "hosts/simulator/Recording.h"
 #include "store/RawDatabase.h"
@@ -269,6 +270,20 @@ TEST_F(SimulatorProgram, TellsWhenItCannotPrint) {
   const Ended ended = run({"--history-days", "0", "--print"});
   EXPECT_EQ(ended.code, 1);
   EXPECT_EQ(ended.errors, "quorl-simulator: standard output cannot be written\n");
+}
+
+TEST_F(SimulatorProgram, PrintsIntoNoOtherFileForWantOfStandardOutput) {
+  const auto recording = directory.path() / "way.jsonl";
+  process.setChildProcessModifier([] { ::close(STDOUT_FILENO); });
+  const Ended silent = run({"--history-days", "0", "--record", recording.string(), "--seconds", "1"});
+  EXPECT_EQ(silent.code, 0) << silent.errors;
+  const auto read = simulator::readRecording(recording);
+  ASSERT_TRUE(read);
+  EXPECT_FALSE(read->events.empty());
+  EXPECT_TRUE(read->faults.empty());
+  const Ended printing = run({"--print", "--seconds", "1"});
+  EXPECT_EQ(printing.code, 1);
+  EXPECT_EQ(printing.errors, "quorl-simulator: standard output cannot be written\n");
 }
 
 TEST_F(SimulatorProgram, TakesPicturesWhenItIsAskedToEnd) {

@@ -1,9 +1,5 @@
-#include <QCoreApplication>
 #include <QQuickWindow>
 #include <filesystem>
-#include <iostream>
-#include <sstream>
-#include <string>
 
 #include <gtest/gtest.h>
 

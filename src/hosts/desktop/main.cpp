@@ -16,8 +16,10 @@
 #include <system_error>
 #include <utility>
 
+#include <fcntl.h>
 #include <fmt/format.h>
 #include <spdlog/sinks/stdout_color_sinks.h>
+#include <unistd.h>
 
 #include "app/AppDelegate.h"
 #include "base/SpdlogSink.h"
@@ -54,6 +56,14 @@ void readEnglishWithoutALanguage() {
   if (language != "C" && language != "POSIX" && language != "C.UTF-8") return;
   std::setlocale(LC_MESSAGES, "C.UTF-8");
   setenv("LANGUAGE", "en", /*overwrite=*/0);
+}
+
+/// A standard file that the program was started without would be the next file that is opened, and what is printed
+/// would go there. To be written, it stays unusable.
+void fillStandardFiles() {
+  int opened = ::open("/dev/null", O_RDONLY);
+  while (opened >= 0 && opened <= STDERR_FILENO) opened = ::open("/dev/null", O_RDONLY);
+  if (opened >= 0) ::close(opened);
 }
 
 int fail(const std::string& text) {
@@ -129,6 +139,7 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
 }  // namespace
 
 int main(int argc, char** argv) {
+  fillStandardFiles();
   QCoreApplication::setApplicationName("quorl-simulator");
   const auto options = SimulatorOptions::parse(argc, argv);
   if (!options) return options.error();
