@@ -55,7 +55,8 @@ file(GLOB desktop_sources CONFIGURE_DEPENDS hosts/desktop/*.cpp hosts/desktop/*.
 list(FILTER desktop_sources EXCLUDE REGEX "/main\\.cpp$")
 quorl_warn_in(${desktop_sources})
 add_library(quorl_desktop STATIC ${desktop_sources})
-target_compile_definitions(quorl_desktop PRIVATE QUORL_RESOURCE_DIRECTORY="${PROJECT_SOURCE_DIR}/resources")
+target_compile_definitions(quorl_desktop PRIVATE QUORL_RESOURCE_DIRECTORY="${PROJECT_SOURCE_DIR}/resources"
+                                                 QUORL_VERSION="${PROJECT_VERSION}")
 target_link_libraries(quorl_desktop PUBLIC quorl_ui quorl_simulator Qt6::DBus CLI11::CLI11)
 
 add_executable(quorl-simulator hosts/desktop/main.cpp)

@@ -21,6 +21,7 @@
 #include "ToolLog.h"
 #include "app/HardwareManager.h"
 #include "base/NotificationCenter.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "shell/NotificationNames.h"
 #include "telephony/CarrierNameSegmentView.h"
 
@@ -105,7 +106,7 @@ int showCarriers(const CarriersOptions& options) {
   auto steps = readScript(options.telephonyScript, faults);
   if (!steps) return kFailure;
   const auto made = RunDocuments::make(options.documents);
-  const auto prepared = made ? prepareDocuments((*made)->path()) : tl::unexpected(made.error());
+  const auto prepared = made ? simulator::prepareDocuments((*made)->path()) : tl::unexpected(made.error());
   if (!prepared) {
     complain(prepared.error());
     return kFailure;

@@ -12,7 +12,7 @@
 #include <fmt/format.h>
 
 #include "Commands.h"
-#include "OptionNumber.h"
+#include "hosts/simulator/OptionNumber.h"
 
 namespace quorl::tool {
 namespace {
@@ -56,13 +56,13 @@ CommandOption& CommandOption::notEmpty() {
 CommandOption& CommandOption::wholeWithin(std::uint64_t least, std::uint64_t most) {
   // The limits of a type say nothing to a reader of the help.
   const bool isLimit = std::in_range<std::int64_t>(most) && most < std::numeric_limits<std::int64_t>::max();
-  option_->transform(CLI::Validator([=](std::string& text) { return wholeNumberFault(text, least, most); },
+  option_->transform(CLI::Validator([=](std::string& text) { return simulator::wholeNumberFault(text, least, most); },
                                     isLimit ? fmt::format("{} to {}", least, most) : std::string()));
   return *this;
 }
 
 CommandOption& CommandOption::within(double least, double most) {
-  option_->check([=](const std::string& text) { return numberFault(text, least, most); },
+  option_->check([=](const std::string& text) { return simulator::numberFault(text, least, most); },
                  fmt::format("{} to {}", least, most));
   return *this;
 }

@@ -1,8 +1,5 @@
 #include "Documents.h"
 
-#include <cerrno>
-#include <cstdlib>
-#include <fstream>
 #include <functional>
 #include <memory>
 #include <string_view>
@@ -11,9 +8,8 @@
 
 #include <fmt/format.h>
 #include <sqlite3.h>
-#include <unistd.h>
 
-#include "hosts/simulator/PhoneServices.h"
+#include "hosts/simulator/UsableDocuments.h"
 
 namespace quorl::tool {
 
@@ -62,78 +58,6 @@ tl::unexpected<std::string> cannotUse(const fs::path& path, std::string_view why
   return tl::unexpected(fmt::format("{}: {}", path.string(), why));
 }
 
-std::string systemMessage() {
-  return std::generic_category().message(errno);
-}
-
-/// Permissions alone do not tell whether a file can be made.
-tl::expected<void, std::string> tryWriting(const fs::path& directory) {
-  std::string probe = (directory / ".quorl-XXXXXX").string();
-  const int file = mkstemp(probe.data());
-  if (file < 0) return cannotUse(directory, systemMessage());
-  close(file);
-  unlink(probe.c_str());
-  return {};
-}
-
-/// Whether both are one file, or would be once they are there.
-bool isSameFile(const fs::path& one, const fs::path& other) {
-  std::error_code error;
-  if (fs::equivalent(one, other, error)) return true;
-  const fs::path first = fs::weakly_canonical(one, error);
-  return !error && first == fs::weakly_canonical(other, error) && !error;
-}
-
-/// Whether a file that is there begins as a database or the log of one does.
-bool looksLikeDatabase(const fs::path& file) {
-  constexpr std::string_view kDatabase{"SQLite format 3\0", 16};
-  constexpr std::string_view kLog{"\x37\x7f\x06", 3};
-  std::error_code ignored;
-  if (!fs::is_regular_file(file, ignored)) return false;
-  std::string begin(kDatabase.size(), ' ');
-  std::ifstream(file, std::ios::binary).read(begin.data(), static_cast<std::streamsize>(begin.size()));
-  return begin == kDatabase || begin.starts_with(kLog);
-}
-
-}  // namespace
-
-fs::path databaseFile(const fs::path& documents) {
-  return documents / "metricPartV11.sqlite";
-}
-
-tl::expected<void, std::string> prepareDocuments(const fs::path& documents) {
-  errno = 0;
-  if (!simulator::FixedDocumentsDirectory(documents).path())
-    return cannotUse(documents, errno != 0 ? systemMessage() : "cannot be made");
-  if (auto written = tryWriting(documents); !written) return written;
-  const fs::path file = databaseFile(documents);
-  std::error_code error;
-  if (!fs::exists(file, error)) return error ? cannotUse(file, error.message()) : tl::expected<void, std::string>();
-  auto database = Database::open(file, SQLITE_OPEN_READWRITE);
-  if (!database) return cannotUse(file, database.error());
-  if (auto read = database->run("SELECT count(*) FROM sqlite_master"); !read) return cannotUse(file, read.error());
-  return {};
-}
-
-tl::expected<void, std::string> spareDatabase(const fs::path& target, const fs::path& documents) {
-  bool isPart = looksLikeDatabase(target);
-  if (!documents.empty())
-    for (const char* ending : {"", "-wal", "-shm", "-journal"})
-      isPart = isPart || isSameFile(target, databaseFile(documents).concat(ending));
-  if (isPart) return cannotUse(target, "belongs to a database and is not overwritten");
-  return {};
-}
-
-tl::expected<void, std::string> foldWriteAheadLog(const fs::path& documents) {
-  const fs::path file = databaseFile(documents);
-  auto database = Database::open(file, SQLITE_OPEN_READWRITE);
-  if (!database) return cannotUse(file, database.error());
-  if (auto folded = database->run("PRAGMA wal_checkpoint(TRUNCATE)"); !folded) return cannotUse(file, folded.error());
-  return {};
-}
-
-namespace {
-
 /// Opens a database that is there already.
 tl::expected<Database, std::string> openExisting(const fs::path& file) {
   std::error_code error;
@@ -145,8 +69,16 @@ tl::expected<Database, std::string> openExisting(const fs::path& file) {
 
 }  // namespace
 
+tl::expected<void, std::string> foldWriteAheadLog(const fs::path& documents) {
+  const fs::path file = simulator::databaseFile(documents);
+  auto database = Database::open(file, SQLITE_OPEN_READWRITE);
+  if (!database) return cannotUse(file, database.error());
+  if (auto folded = database->run("PRAGMA wal_checkpoint(TRUNCATE)"); !folded) return cannotUse(file, folded.error());
+  return {};
+}
+
 std::optional<StoredRows> storedRows(const fs::path& documents, std::int64_t lastId) {
-  const auto database = openExisting(databaseFile(documents));
+  const auto database = openExisting(simulator::databaseFile(documents));
   if (!database) return std::nullopt;
   StoredRows rows;
   const auto read = database->run(fmt::format("SELECT count(*), max(Id) FROM Metric WHERE Id <= {}", lastId).c_str(),
@@ -158,7 +90,7 @@ std::optional<StoredRows> storedRows(const fs::path& documents, std::int64_t las
 
 tl::expected<std::string, std::string> basebandFamily(const fs::path& documents) {
   constexpr std::int64_t kLeastIceId = 3900000;
-  const fs::path file = databaseFile(documents);
+  const fs::path file = simulator::databaseFile(documents);
   const auto database = openExisting(file);
   if (!database) return tl::unexpected(database.error());
   bool isIce = false;
@@ -169,7 +101,7 @@ tl::expected<std::string, std::string> basebandFamily(const fs::path& documents)
 }
 
 tl::expected<std::vector<MetricSummary>, std::string> summarize(const fs::path& documents) {
-  const fs::path file = databaseFile(documents);
+  const fs::path file = simulator::databaseFile(documents);
   const auto database = openExisting(file);
   if (!database) return tl::unexpected(database.error());
   std::vector<MetricSummary> metrics;

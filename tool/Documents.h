@@ -12,17 +12,6 @@
 
 namespace quorl::tool {
 
-std::filesystem::path databaseFile(const std::filesystem::path& documents);
-
-/// Makes the directory if it is missing, and finds out whether a store can live there. The store itself ends the
-/// process when it cannot.
-tl::expected<void, std::string> prepareDocuments(const std::filesystem::path& documents);
-
-/// Fails if writing `target` would destroy a database: a part of the one in `documents`, which may be empty, or any
-/// other.
-tl::expected<void, std::string> spareDatabase(const std::filesystem::path& target,
-                                              const std::filesystem::path& documents);
-
 /// Rows of metrics.
 struct StoredRows {
   std::int64_t count = 0;

@@ -6,10 +6,10 @@
 #include <fmt/format.h>
 
 #include "Commands.h"
-#include "Documents.h"
 #include "OutputFile.h"
 #include "StoreSession.h"
 #include "TimeFrameOption.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "screens/export/ExportViewController.h"
 
 namespace quorl::tool {
@@ -54,7 +54,7 @@ void addExport(CommandLine& tool) {
   addStoreOptions(command, options->store, /*isTable=*/false);
   command.setAction([options] {
     if (!options->output.empty()) {
-      if (const auto spared = spareDatabase(options->output, options->store.documents); !spared) {
+      if (const auto spared = simulator::spareDatabase(options->output, options->store.documents); !spared) {
         complain(spared.error());
         return kWrongUse;
       }

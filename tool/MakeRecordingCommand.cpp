@@ -7,8 +7,8 @@
 #include <fmt/format.h>
 
 #include "Commands.h"
-#include "Documents.h"
 #include "hosts/simulator/Recording.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "recording/RecordingMaker.h"
 
 namespace quorl::tool {
@@ -21,7 +21,7 @@ struct MakeRecordingOptions {
 };
 
 int writeRecording(const MakeRecordingOptions& options) {
-  if (const auto spared = spareDatabase(options.output, {}); !spared) {
+  if (const auto spared = simulator::spareDatabase(options.output, {}); !spared) {
     complain(spared.error());
     return kWrongUse;
   }

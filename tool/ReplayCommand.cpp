@@ -25,6 +25,7 @@
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/SimulatedPhone.h"
 #include "hosts/simulator/TimeShift.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "intake/MetricGroupV2.h"
 #include "messages/MetricCodable.h"
 
@@ -108,7 +109,7 @@ int replay(const ReplayOptions& options) {
   if (!events) return kFailure;
   auto steps = readScript(options.telephonyScript, faults);
   if (!steps) return kFailure;
-  if (const auto prepared = prepareDocuments(options.documents); !prepared) {
+  if (const auto prepared = simulator::prepareDocuments(options.documents); !prepared) {
     complain(prepared.error());
     return kFailure;
   }

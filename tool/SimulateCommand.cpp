@@ -21,6 +21,7 @@
 #include "base/DateText.h"
 #include "hosts/simulator/PhoneServices.h"
 #include "hosts/simulator/ScenarioFiles.h"
+#include "hosts/simulator/UsableDocuments.h"
 
 namespace quorl::tool {
 namespace {
@@ -61,7 +62,7 @@ std::string contradiction(const SimulateOptions& options) {
   if (!startOf(options)) return fmt::format("{} is no time of the form yyyy-MM-dd HH:mm:ss", options.start);
   const std::string& recording = options.output.empty() ? options.record : options.output;
   if (recording.empty()) return {};
-  const auto spared = spareDatabase(recording, options.documents);
+  const auto spared = simulator::spareDatabase(recording, options.documents);
   return spared ? std::string() : spared.error();
 }
 
@@ -95,7 +96,7 @@ int writeRecording(const SimulateOptions& options, ScenarioChoice choice) {
 }
 
 int fillDocuments(const SimulateOptions& options, const ScenarioChoice& choice) {
-  if (const auto prepared = prepareDocuments(options.documents); !prepared) return fail(prepared.error());
+  if (const auto prepared = simulator::prepareDocuments(options.documents); !prepared) return fail(prepared.error());
   const Date until = SystemClock().now();
   const RemovedRows removed(options.documents);
   SimulatedProduct product(options.family, options.documents, options.isVerbose);

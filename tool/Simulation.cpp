@@ -6,13 +6,13 @@
 #include <thread>
 #include <utility>
 
-#include "Documents.h"
 #include "ProductRun.h"
 #include "RowCounter.h"
 #include "ToolLog.h"
 #include "hosts/simulator/EpochTime.h"
 #include "hosts/simulator/RecordingWriter.h"
 #include "hosts/simulator/SimulatedPhone.h"
+#include "hosts/simulator/UsableDocuments.h"
 
 namespace quorl::tool {
 namespace {
@@ -77,7 +77,7 @@ tl::expected<MadeHistory, std::string> SimulatedProduct::makeHistory(
     const simulator::HistoryPlan& plan, const std::function<void(const simulator::HistoryProgress&)>& progress) {
   installToolLog(isVerbose_);
   const auto begin = std::chrono::steady_clock::now();
-  auto made = simulator::writeHistory(databaseFile(documents_), plan, progress);
+  auto made = simulator::writeHistory(simulator::databaseFile(documents_), plan, progress);
   installLogSink(nullptr);
   if (!made) return tl::unexpected(std::move(made.error()));
   return MadeHistory{made->sessionsDone, made->events, made->rows, secondsSince(begin)};

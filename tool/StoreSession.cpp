@@ -6,6 +6,7 @@
 #include "RemovedRows.h"
 #include "ToolLog.h"
 #include "app/HardwareManager.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "intake/ZelkorWrapper.h"
 
 namespace quorl::tool {
@@ -41,7 +42,8 @@ void addStoreOptions(Command& command, StoreOptions& options, bool isTable) {
 tl::expected<StoreSession*, std::string> StoreSession::open(const StoreOptions& options) {
   auto family = basebandFamily(options.documents);
   if (!family) return tl::unexpected(std::move(family.error()));
-  if (auto prepared = prepareDocuments(options.documents); !prepared) return tl::unexpected(prepared.error());
+  if (auto prepared = simulator::prepareDocuments(options.documents); !prepared)
+    return tl::unexpected(prepared.error());
   RemovedRows removed(options.documents);
   installToolLog(options.isVerbose);
   auto* session = new StoreSession(options, options.chipset.empty() ? *std::move(family) : options.chipset);

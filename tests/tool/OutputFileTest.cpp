@@ -5,9 +5,9 @@
 
 #include <gtest/gtest.h>
 
-#include "Documents.h"
 #include "OutputFile.h"
 #include "ToolRun.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "support/FileSizeLimit.h"
 #include "support/TemporaryDirectory.h"
 
@@ -89,24 +89,24 @@ TEST_F(OutputFile, ThatIsADeviceIsWrittenDirectly) {
 TEST_F(OutputFile, IsNeverAPartOfADatabase) {
   for (const char* name : {"metricPartV11.sqlite", "metricPartV11.sqlite-wal", "metricPartV11.sqlite-shm"}) {
     const fs::path part = directory.path() / name;
-    EXPECT_FALSE(tool::spareDatabase(part, directory.path())) << "before it is there";
-    EXPECT_TRUE(tool::spareDatabase(part, {})) << "a name alone is nothing";
+    EXPECT_FALSE(simulator::spareDatabase(part, directory.path())) << "before it is there";
+    EXPECT_TRUE(simulator::spareDatabase(part, {})) << "a name alone is nothing";
     writeFile(part, "x");
     fs::create_hard_link(part, file);
-    const auto spared = tool::spareDatabase(file, directory.path());
+    const auto spared = simulator::spareDatabase(file, directory.path());
     ASSERT_FALSE(spared) << name;
     EXPECT_EQ(spared.error(), file.string() + ": belongs to a database and is not overwritten");
     fs::remove(file);
   }
-  EXPECT_TRUE(tool::spareDatabase(file, directory.path()));
+  EXPECT_TRUE(simulator::spareDatabase(file, directory.path()));
 }
 
 TEST_F(OutputFile, IsNoDatabaseOfAnotherDirectory) {
   writeFile(file, std::string("SQLite format 3\0...", 19));
-  EXPECT_FALSE(tool::spareDatabase(file, {}));
+  EXPECT_FALSE(simulator::spareDatabase(file, {}));
   writeFile(file, "SQLite format 4");
-  EXPECT_TRUE(tool::spareDatabase(file, {}));
-  EXPECT_TRUE(tool::spareDatabase("/dev/null", {}));
+  EXPECT_TRUE(simulator::spareDatabase(file, {}));
+  EXPECT_TRUE(simulator::spareDatabase("/dev/null", {}));
 }
 
 }  // namespace

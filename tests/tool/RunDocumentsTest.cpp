@@ -5,9 +5,9 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
-#include "Documents.h"
 #include "RunDocuments.h"
 #include "ToolRun.h"
+#include "hosts/simulator/UsableDocuments.h"
 #include "support/TemporaryDirectory.h"
 #include "support/TimeZoneAndLocale.h"
 
@@ -23,7 +23,7 @@ class RunDocumentsTest : public testing::Test {
   [[noreturn]] static void endByA(int signal) {
     const auto documents = RunDocuments::make("");
     const fs::path path = (*documents)->path();
-    if (!tool::prepareDocuments(path)) _exit(1);
+    if (!simulator::prepareDocuments(path)) _exit(1);
     writeFile(path / "file", "x");
     kill(getpid(), signal);
     for (;;) pause();
@@ -46,7 +46,7 @@ TEST_F(RunDocumentsTest, StayWhereTheUserNamedThem) {
     const auto documents = RunDocuments::make(named.string());
     ASSERT_TRUE(documents);
     EXPECT_TRUE((*documents)->isNamed());
-    ASSERT_TRUE(tool::prepareDocuments((*documents)->path()));
+    ASSERT_TRUE(simulator::prepareDocuments((*documents)->path()));
   }
   EXPECT_TRUE(fs::is_directory(named));
 }

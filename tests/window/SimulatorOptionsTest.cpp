@@ -151,7 +151,7 @@ TEST(SimulatorOptions, MistakesAreTold) {
                                                                  {"--seconds"}})
     EXPECT_THAT(refusal(wrong), AllOf(StartsWith("quorl-simulator: "), HasSubstr(wrong.front()), EndsWith(kSeeHelp)));
   EXPECT_EQ(refusal({"--seconds", "-1"}),
-            std::string("quorl-simulator: --seconds: -1 is no number above 0") + kSeeHelp);
+            std::string("quorl-simulator: --seconds: -1 is no number from 0.001 to 1000000000") + kSeeHelp);
   EXPECT_EQ(refusal({"--speed", "0"}),
             std::string("quorl-simulator: --speed: 0 is no number from 0.01 to 1000") + kSeeHelp);
 }

@@ -132,6 +132,21 @@ TEST_F(SimulatorProgram, EndsWholeWhenItIsAskedTo) {
   EXPECT_TRUE(read->faults.empty());
 }
 
+TEST_F(SimulatorProgram, SaysWhichVersionItIs) {
+  const Ended ended = run({"--version"});
+  EXPECT_EQ(ended.code, 0);
+  EXPECT_EQ(ended.errors, "");
+  EXPECT_THAT(ended.output, testing::MatchesRegex("quorl-simulator [0-9]+\\.[0-9]+\\.[0-9]+\n"));
+}
+
+TEST_F(SimulatorProgram, RecordsIntoNoDatabase) {
+  run({"--seconds", "0.1", "--history-days", "0"});
+  const Ended ended = run({"--seconds", "0.1", "--record", database.string()});
+  EXPECT_EQ(ended.code, 1);
+  EXPECT_EQ(ended.errors, "quorl-simulator: " + database.string() + ": belongs to a database and is not overwritten\n");
+  EXPECT_EQ(RawDatabase(database).column("PRAGMA integrity_check").at(0), "ok");
+}
+
 TEST_F(SimulatorProgram, ATypingMistakeIsToldInALine) {
   const Ended scenario = run({"--scenario", "moon"});
   EXPECT_EQ(scenario.code, 2);

@@ -2,6 +2,7 @@
 
 #include <QStandardPaths>
 #include <algorithm>
+#include <cstdint>
 #include <memory>
 #include <utility>
 #include <variant>
@@ -11,9 +12,9 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
-#include "hosts/desktop/NumberChecks.h"
 #include "hosts/desktop/PlayedRadio.h"
 #include "hosts/desktop/Tell.h"
+#include "hosts/simulator/OptionNumber.h"
 #include "hosts/simulator/Recording.h"
 #include "hosts/simulator/ScenarioFiles.h"
 #include "hosts/simulator/TelephonyScript.h"
@@ -26,6 +27,8 @@ using simulator::metrics::Family;
 
 constexpr char kUnknownChipset[] = "none";
 constexpr char kUsualScenario[] = "city";
+constexpr double kShortestRun = 0.001;
+constexpr double kLongestRun = 1e9;
 
 std::vector<std::filesystem::path> resources() {
   return simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY);
@@ -124,6 +127,7 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
   std::string chipset = "mav20";
   std::string deviceClass;
   CLI::App app("Quorl on a phone that exists only in software.");
+  app.set_version_flag("--version", "quorl-simulator " QUORL_VERSION, "Print the version and exit");
   app.add_option(
          "--chipset", chipset,
          "Baseband chipset; \"mav\" or \"ice\" in it selects the family, \"none\" is a device that does not say")
@@ -138,7 +142,8 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
                              joined(simulator::scenarioNames(resources()), ", "), kUsualScenario))
       ->check(CLI::Validator(faultOfScenario, ""));
   app.add_option("--seed", options.seed, "Which of the scenario's runs")
-      ->check(CLI::Validator(faultOfSeed, "0 OR MORE"))
+      ->transform(CLI::Validator([](std::string& text) { return simulator::wholeNumberFault(text, 0, UINT64_MAX); },
+                                 "0 OR MORE"))
       ->capture_default_str();
   auto* recording =
       app.add_option("--recording", options.recording, "Recording to play over and over in place of a scenario")
@@ -153,13 +158,15 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
       ->check(CLI::Range(0, 31))
       ->capture_default_str();
   app.add_option("--speed", options.speed, "How many times as fast as life everything goes")
-      ->check(CLI::Validator([](const std::string& text) { return faultOfNumber(text, 0.01, 1000); }, "0.01 TO 1000"))
+      ->check([](const std::string& text) { return simulator::numberFault(text, 0.01, 1000); }, "0.01 TO 1000")
       ->capture_default_str();
   app.add_option("--documents", options.documents, "Directory for the database; made if it is missing");
   app.add_flag("--verbose", options.isVerbose, "Show the log on standard error");
   app.add_flag("--print", options.prints, "Print dashboard and metric list as they refresh");
   app.add_option("--screenshots", options.screenshots, "Write pictures of the tabs here before the end");
-  app.add_option("--seconds", options.seconds, "End after this time")->check(CLI::Validator(faultOfTime, "ABOVE 0"));
+  app.add_option("--seconds", options.seconds, "End after this time")
+      ->check([](const std::string& text) { return simulator::numberFault(text, kShortestRun, kLongestRun); },
+              fmt::format("{} TO {}", kShortestRun, kLongestRun));
   try {
     app.parse(argc, argv);
   } catch (const CLI::ParseError& error) {

@@ -48,7 +48,6 @@ using desktop::SimulatorOptions;
 constexpr char kTabletClass[] = "Tabrin";
 constexpr QSize kPhone{390, 844};
 constexpr QSize kTablet{1024, 768};
-constexpr double kLongestSeconds = 3e9;  // a clock counts no further than three times that
 
 /// A system that has no language, such as a bare container, reads the English string table rather than raw names.
 void readEnglishWithoutALanguage() {
@@ -92,6 +91,8 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
   if (!programme) return fail(programme.error());
   for (const std::string& fault : programme->faults) desktop::tell(fault);
   if (const auto usable = simulator::prepareDocuments(options.documents); !usable) return fail(usable.error());
+  if (const auto spared = simulator::spareDatabase(options.record, options.documents); !spared)
+    return fail(spared.error());
   // From here on there is something to leave whole; before, a signal ends the program as usual.
   desktop::QuitOnSignal quitting;
   // The product has no tear-down: what is made here lives until the process ends.
@@ -126,7 +127,7 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
   if (options.prints) unwatched.printChanges();
   desktop::QtQueue ending("end");
   if (options.seconds) {
-    const std::chrono::duration<double> time(std::min(*options.seconds, kLongestSeconds));
+    const std::chrono::duration<double> time(*options.seconds);
     ending.asyncAfter(std::chrono::duration_cast<Queue::Duration>(time), [&unwatched] { unwatched.end(); });
   }
   const int code = application.exec();

@@ -2,6 +2,7 @@
 
 #include <cerrno>
 #include <cstdlib>
+#include <fstream>
 #include <memory>
 #include <string_view>
 #include <system_error>
@@ -19,7 +20,6 @@ namespace fs = std::filesystem;
 
 namespace {
 
-constexpr char kDatabaseName[] = "metricPartV11.sqlite";
 constexpr int kLongestLockMs = 5000;
 
 tl::unexpected<std::string> unusable(const fs::path& path, std::string_view why) {
@@ -47,14 +47,47 @@ tl::expected<void, std::string> tryReading(const fs::path& file) {
   return {};
 }
 
+/// Whether both are one file, or would be once they are there.
+bool isSameFile(const fs::path& one, const fs::path& other) {
+  std::error_code error;
+  if (fs::equivalent(one, other, error)) return true;
+  const fs::path first = fs::weakly_canonical(one, error);
+  return !error && first == fs::weakly_canonical(other, error) && !error;
+}
+
+/// Whether a file that is there begins as a database or the log of one does.
+bool looksLikeDatabase(const fs::path& file) {
+  constexpr std::string_view kDatabase{"SQLite format 3\0", 16};
+  constexpr std::string_view kLog{"\x37\x7f\x06", 3};
+  std::error_code ignored;
+  if (!fs::is_regular_file(file, ignored)) return false;
+  std::string begin(kDatabase.size(), ' ');
+  std::ifstream(file, std::ios::binary).read(begin.data(), static_cast<std::streamsize>(begin.size()));
+  return begin == kDatabase || begin.starts_with(kLog);
+}
+
 }  // namespace
+
+fs::path databaseFile(const fs::path& documents) {
+  return documents / "metricPartV11.sqlite";
+}
 
 tl::expected<void, std::string> prepareDocuments(const fs::path& documents) {
   if (!FixedDocumentsDirectory(documents).path()) return unusable(documents, std::generic_category().message(errno));
   if (auto written = tryWriting(documents); !written) return written;
-  const fs::path file = documents / kDatabaseName;
-  std::error_code ignored;
-  return fs::exists(file, ignored) ? tryReading(file) : tl::expected<void, std::string>();
+  const fs::path file = databaseFile(documents);
+  std::error_code error;
+  if (fs::exists(file, error)) return tryReading(file);
+  return error ? unusable(file, error.message()) : tl::expected<void, std::string>();
+}
+
+tl::expected<void, std::string> spareDatabase(const fs::path& target, const fs::path& documents) {
+  bool isPart = looksLikeDatabase(target);
+  if (!documents.empty())
+    for (const char* ending : {"", "-wal", "-shm", "-journal"})
+      isPart = isPart || isSameFile(target, databaseFile(documents).concat(ending));
+  if (isPart) return unusable(target, "belongs to a database and is not overwritten");
+  return {};
 }
 
 }  // namespace quorl::simulator

@@ -1,4 +1,4 @@
-#include "OptionNumber.h"
+#include "hosts/simulator/OptionNumber.h"
 
 #include <charconv>
 #include <cmath>
@@ -7,7 +7,7 @@
 
 #include <fmt/format.h>
 
-namespace quorl::tool {
+namespace quorl::simulator {
 namespace {
 
 /// The number that is the whole of `text`.
@@ -35,4 +35,4 @@ std::string numberFault(const std::string& text, double least, double most) {
   return fmt::format("{} is no number from {} to {}", text, least, most);
 }
 
-}  // namespace quorl::tool
+}  // namespace quorl::simulator
