@@ -111,7 +111,7 @@ int showCarriers(const CarriersOptions& options) {
     complain(prepared.error());
     return kFailure;
   }
-  const RunDocuments& documents = **made;
+  RunDocuments& documents = **made;
   const RemovedRows removed(documents.path());
 
   // As the product, they live until the process ends.
@@ -124,6 +124,7 @@ int showCarriers(const CarriersOptions& options) {
   ProductRun product(*phone);
   Player player(*phone, *std::move(steps));
   product.launch([&player] { player.goTo(std::chrono::milliseconds(0)); });
+  documents.settled();
   player.goTo(options.untilMs ? std::chrono::milliseconds(*options.untilMs) : std::chrono::milliseconds::max());
   const bool isPressed = press(*bar, *phone, options.pressedTabs);
   if (isPressed) options.asJson ? printJson(*bar) : printTables(*bar);

@@ -49,17 +49,32 @@ std::optional<fs::path> replaceable(const fs::path& file) {
   return error ? std::nullopt : std::optional(std::move(behindLinks));
 }
 
-/// Nothing if no file can be made beside it.
+/// Gives the file that takes the place of another its permissions and owner.
+bool takesAfter(int file, const fs::path& other) {
+  struct stat mine {
+  }, old{};
+  if (stat(other.c_str(), &old) != 0) return true;  // there is none
+  if (fchmod(file, old.st_mode & 0777U) != 0 || fstat(file, &mine) != 0) return false;
+  return (mine.st_uid == old.st_uid && mine.st_gid == old.st_gid) || fchown(file, old.st_uid, old.st_gid) == 0;
+}
+
+bool isForbidden(int error) {
+  return error == EACCES || error == EPERM || error == EROFS;
+}
+
+/// Nothing if there is no right to have a file beside it that then takes its place.
 std::optional<int> writeBeside(const fs::path& file, std::string_view text) {
   std::string beside = (file.parent_path() / ".quorl-XXXXXX").string();
   const int opened = mkostemp(beside.data(), O_CLOEXEC);
-  if (opened < 0) return std::nullopt;
-  struct stat old {};
-  if (stat(file.c_str(), &old) == 0) fchmod(opened, old.st_mode & 0777U);
-  int error = fill(opened, text);
-  if (error == 0 && std::rename(beside.c_str(), file.c_str()) != 0) error = errno;
-  if (error != 0) unlink(beside.c_str());
-  return error;
+  if (opened < 0) return isForbidden(errno) ? std::nullopt : std::optional(errno);
+  const bool isAlike = takesAfter(opened, file);
+  const int error = fill(opened, text);
+  const int moved = error != 0 || !isAlike || std::rename(beside.c_str(), file.c_str()) == 0 ? 0 : errno;
+  if (error == 0 && isAlike && moved == 0) return 0;
+  unlink(beside.c_str());
+  if (error != 0) return error;
+  const bool isFixed = moved == EBUSY || moved == EXDEV;  // as where another file system is mounted on it
+  return !isAlike || isFixed || isForbidden(moved) ? std::nullopt : std::optional(moved);
 }
 
 }  // namespace

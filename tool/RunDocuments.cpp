@@ -34,12 +34,13 @@ sigset_t endingSignals() {
 }
 
 /// A thread waits for the signal, since a handler could not remove anything.
-void removeWhenInterrupted(const fs::path& directory) {
+void removeWhenInterrupted(const fs::path& directory, const std::shared_ptr<std::mutex>& inUse) {
   const sigset_t signals = endingSignals();
   pthread_sigmask(SIG_BLOCK, &signals, nullptr);
-  std::thread([directory, signals] {
+  std::thread([directory, inUse, signals] {
     int signal = 0;
     if (sigwait(&signals, &signal) != 0) return;
+    const std::lock_guard lock(*inUse);
     removeWhole(directory);
     pthread_sigmask(SIG_UNBLOCK, &signals, nullptr);
     raise(signal);
@@ -58,12 +59,19 @@ tl::expected<std::unique_ptr<RunDocuments>, std::string> RunDocuments::make(cons
       new RunDocuments(parent / ("quorl-carriers-" + Uuid::make().string()), /*isNamed=*/false));
 }
 
-RunDocuments::RunDocuments(fs::path path, bool isNamed) : path_(std::move(path)), isNamed_(isNamed) {
-  if (!isNamed_) removeWhenInterrupted(path_);
+RunDocuments::RunDocuments(fs::path path, bool isNamed)
+    : path_(std::move(path)), isNamed_(isNamed), inUse_(std::make_shared<std::mutex>()), using_(*inUse_) {
+  if (!isNamed_) removeWhenInterrupted(path_, inUse_);
 }
 
 RunDocuments::~RunDocuments() {
-  if (!isNamed_) removeWhole(path_);
+  if (isNamed_) return;
+  if (!using_) using_.lock();
+  removeWhole(path_);
+}
+
+void RunDocuments::settled() {
+  using_.unlock();
 }
 
 }  // namespace quorl::tool

@@ -98,7 +98,6 @@ int writeRecording(const SimulateOptions& options, ScenarioChoice choice) {
 int fillDocuments(const SimulateOptions& options, const ScenarioChoice& choice) {
   if (const auto prepared = simulator::prepareDocuments(options.documents); !prepared) return fail(prepared.error());
   const Date until = SystemClock().now();
-  const RemovedRows removed(options.documents);
   SimulatedProduct product(options.family, options.documents, options.isVerbose);
   if (options.historyDays > 0) {
     ProgressBar bar;
@@ -116,6 +115,7 @@ int fillDocuments(const SimulateOptions& options, const ScenarioChoice& choice) 
   }
   const std::optional<std::filesystem::path> recording =
       options.record.empty() ? std::nullopt : std::optional<std::filesystem::path>(options.record);
+  const RemovedRows removed(options.documents);
   ProgressBar bar;
   const auto lived =
       product.live({choice, options.speed > 0 ? options.speed : 1, recording}, lengthOf(options),
@@ -127,10 +127,10 @@ int fillDocuments(const SimulateOptions& options, const ScenarioChoice& choice) 
                          {"insertsFailed", lived->insertsFailed},
                          {"seconds", rounded(lived->seconds)}})
             << '\n';
-  if (!lived->failedRows.empty()) complain(lived->failedRows);
   const auto folded = foldWriteAheadLog(options.documents);
-  if (!folded) return fail(folded.error());
-  return lived->insertsFailed == 0 ? kSuccess : kFailure;
+  for (const std::string& fault : {lived->failedRows, lived->recordingFault, folded ? std::string() : folded.error()})
+    if (!fault.empty()) complain(fault);
+  return lived->insertsFailed == 0 && lived->recordingFault.empty() && folded ? kSuccess : kFailure;
 }
 
 int simulate(const SimulateOptions& options) {
@@ -175,7 +175,7 @@ void addSimulate(CommandLine& tool) {
   command
       .addOption(
           "--documents", options->documents,
-          "Directory for a database; made if it is missing, and its rows of thirty days ago and older are removed")
+          "Directory for a database; made if it is missing. The product removes its rows of thirty days ago and older")
       .notEmpty();
   command.addOption("--history-days", options->historyDays, "Days of history before now").wholeWithin(1, 31);
   command

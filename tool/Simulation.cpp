@@ -109,8 +109,10 @@ tl::expected<LivedScenario, std::string> SimulatedProduct::live(LiveScenario::Op
   product.terminate([&] {
     (*scenario)->finishRecording([&recorded](const RecordingWriter::Outcome& outcome) { recorded = outcome; });
   });
-  if (recording && recorded && !*recorded) return tl::unexpected(recording->string() + ": " + recorded->error());
-  return LivedScenario{(*scenario)->events(), rows->count(), log->count(), secondsSince(begin), log->report()};
+  std::string recordingFault;
+  if (recording && recorded && !*recorded) recordingFault = recording->string() + ": " + recorded->error();
+  return LivedScenario{(*scenario)->events(), rows->count(), log->count(),
+                       secondsSince(begin),   log->report(), std::move(recordingFault)};
 }
 
 }  // namespace quorl::tool

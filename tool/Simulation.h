@@ -41,7 +41,8 @@ struct LivedScenario {
   std::uint64_t rows = 0;
   std::uint64_t insertsFailed = 0;
   double seconds = 0;
-  std::string failedRows;  // a line for the user; empty if all rows are stored
+  std::string failedRows;      // a line for the user; empty if all rows are stored
+  std::string recordingFault;  // a line for the user; empty if the recording is whole, or if there is none
 };
 
 /// The product on a phone without a screen. A process has one at most, as the product has no tear-down. Errors are

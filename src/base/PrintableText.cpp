@@ -21,12 +21,29 @@ std::size_t lengthByLead(unsigned char lead) {
   return 0;
 }
 
+/// Whether a second byte makes a longer spelling of a character, a surrogate, or more than Unicode has.
+bool isSpelledWrong(unsigned char lead, unsigned char second) {
+  switch (lead) {
+    case 0xE0:
+      return second < 0xA0;
+    case 0xED:
+      return second > 0x9F;
+    case 0xF0:
+      return second < 0x90;
+    case 0xF4:
+      return second > 0x8F;
+    default:
+      return false;
+  }
+}
+
 /// How many bytes the character at the beginning of `text` has; 0 if it is none.
 std::size_t characterLength(std::string_view text) {
   const std::size_t length = lengthByLead(byteAt(text, 0));
   if (length > text.size()) return 0;
   for (std::size_t at = 1; at < length; ++at)
     if ((byteAt(text, at) & 0xC0U) != 0x80) return 0;
+  if (length > 1 && isSpelledWrong(byteAt(text, 0), byteAt(text, 1))) return 0;
   return length;
 }
 

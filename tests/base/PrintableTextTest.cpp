@@ -26,6 +26,10 @@ TEST(PrintableText, PutsADotForEachByteThatIsNoCharacter) {
             ".31m");
   EXPECT_EQ(printable("a\xc3"), "a.");
   EXPECT_EQ(printable("\xe2\x82z\xff\xc0\x9b"), "..z...");
+  EXPECT_EQ(printable("\xe0\x80\x9b|\xf0\x80\x80\x9b|\xed\xa0\x80|\xf4\x90\x80\x80"), "...|....|...|....");
+  EXPECT_EQ(printable("\xe0\xa0\x80\xed\x9f\xbf\xf0\x90\x80\x80\xf4\x8f\xbf\xbf"),
+            "\xe0\xa0\x80\xed\x9f\xbf\xf0\x90\x80\x80\xf4\x8f\xbf\xbf")
+      << "the first and last of each length";
 }
 
 }  // namespace

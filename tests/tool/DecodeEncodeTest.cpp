@@ -178,8 +178,8 @@ TEST(ToolStandardInput, ThatCannotBeReadIsAFailure) {
 }
 
 TEST(ToolStandardInput, IsReadNoFurtherThanItsOutputIsTaken) {
-  const ToolResult result =
-      runProgram("/bin/sh", {"-c", "yes 0801 | \"$0\" decode --class KCellularEmmContext > /dev/full", QUORL_TOOL});
+  const ToolResult result = runProgram(
+      "/bin/sh", {"-c", "yes 0801 2>/dev/null | \"$0\" decode --class KCellularEmmContext > /dev/full", QUORL_TOOL});
   EXPECT_EQ(result.exitCode, 1);
   EXPECT_EQ(result.errors, "quorl-tool: standard output cannot be written\n");
 }

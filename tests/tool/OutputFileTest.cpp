@@ -4,6 +4,8 @@
 #include <string>
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include "OutputFile.h"
 #include "ToolRun.h"
@@ -55,6 +57,21 @@ TEST_F(OutputFile, OnAFullDiskTheEarlierOneStays) {
   EXPECT_EQ(filesInDirectory(), 1) << "nothing is left beside it";
 }
 
+TEST_F(OutputFile, StaysItsOwners) {
+  // Only root can give a file away; anybody else has it already.
+  const uid_t owner = geteuid() == 0 ? 65534 : geteuid();
+  const gid_t group = geteuid() == 0 ? 65534 : getegid();
+  writeFile(file, "earlier");
+  fs::permissions(file, fs::perms(0600));
+  ASSERT_EQ(chown(file.c_str(), owner, group), 0);
+  ASSERT_TRUE(writeWholeFile(file, "text"));
+  struct stat status {};
+  ASSERT_EQ(stat(file.c_str(), &status), 0);
+  EXPECT_EQ(status.st_uid, owner);
+  EXPECT_EQ(status.st_gid, group);
+  EXPECT_EQ(readFile(file), "text");
+}
+
 TEST_F(OutputFile, BehindALinkIsReplacedAndTheLinkStays) {
   writeFile(file, "earlier");
   const fs::path link = directory.path() / "link";
@@ -104,6 +121,10 @@ TEST_F(OutputFile, IsNeverAPartOfADatabase) {
 TEST_F(OutputFile, IsNoDatabaseOfAnotherDirectory) {
   writeFile(file, std::string("SQLite format 3\0...", 19));
   EXPECT_FALSE(simulator::spareDatabase(file, {}));
+  for (const char* begin : {"\x37\x7f\x06\x82", "\x37\x7f\x06\x83", "\xd9\xd5\x05\xf9\x20\xa1\x63\xd7"}) {
+    writeFile(file, begin);
+    EXPECT_FALSE(simulator::spareDatabase(file, {}));
+  }
   writeFile(file, "SQLite format 4");
   EXPECT_TRUE(simulator::spareDatabase(file, {}));
   EXPECT_TRUE(simulator::spareDatabase("/dev/null", {}));

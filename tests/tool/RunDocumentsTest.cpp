@@ -21,13 +21,18 @@ class RunDocumentsTest : public testing::Test {
  protected:
   /// What a run is like that its user ends.
   [[noreturn]] static void endByA(int signal) {
+    std::signal(signal, SIG_DFL);  // whoever started the tests may want it ignored
+    alarm(kLongestSeconds);
     const auto documents = RunDocuments::make("");
     const fs::path path = (*documents)->path();
+    kill(getpid(), signal);  // comes before there is anything
     if (!simulator::prepareDocuments(path)) _exit(1);
     writeFile(path / "file", "x");
-    kill(getpid(), signal);
+    (*documents)->settled();
     for (;;) pause();
   }
+
+  static constexpr unsigned kLongestSeconds = 60;
 
   const TemporaryDirectory directory;
   const ScopedVariable place{"TMPDIR", directory.path().string()};

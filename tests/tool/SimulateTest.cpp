@@ -3,6 +3,7 @@
 #include <string>
 #include <vector>
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
@@ -122,6 +123,26 @@ TEST_F(Simulate, AHistoryIsAsLongAsItsUse) {
     return summary["rows"].get<double>() / summary["sessions"].get<double>();
   };
   EXPECT_GT(rowsOfASession(longer), 2 * rowsOfASession(made));
+}
+
+TEST_F(Simulate, KeepsItsRowsWhenTheirRecordingCannotBeWritten) {
+  const auto result = simulate({"--minutes", "5", "--documents", documents.string(), "--record", "/dev/full"});
+  EXPECT_EQ(result.exitCode, 1);
+  EXPECT_EQ(result.errors, "quorl-tool: /dev/full: No space left on device\n");
+  const auto summary = lastLine(result);
+  EXPECT_GT(summary["rowsInserted"].get<int>(), 0);
+  EXPECT_EQ(summary["insertsFailed"], 0);
+  fs::remove(documents / "metricPartV11.sqlite-wal");
+  EXPECT_EQ(RawDatabase(database).column("SELECT count(*) FROM Metric").at(0), summary["rowsInserted"].dump())
+      << "the database file alone is whole";
+}
+
+TEST_F(Simulate, TellsOfTheRowsOfItsHistoryThatTheProductRemoves) {
+  const auto result = simulate({"--documents", documents.string(), "--history-days", "31", "--sessions-per-day", "1",
+                                "--session-minutes", "0.1", "--minutes", "0.05"});
+  EXPECT_EQ(result.exitCode, 0);
+  EXPECT_THAT(result.errors, testing::MatchesRegex("quorl-tool: [0-9]+ rows of thirty days ago and older were "
+                                                   "removed\n"));
 }
 
 TEST_F(Simulate, TellsWhatCannotBeWritten) {

@@ -55,15 +55,16 @@ bool isSameFile(const fs::path& one, const fs::path& other) {
   return !error && first == fs::weakly_canonical(other, error) && !error;
 }
 
-/// Whether a file that is there begins as a database or the log of one does.
+/// Whether a file that is there begins as a database, or the log or journal of one, does.
 bool looksLikeDatabase(const fs::path& file) {
   constexpr std::string_view kDatabase{"SQLite format 3\0", 16};
   constexpr std::string_view kLog{"\x37\x7f\x06", 3};
+  constexpr std::string_view kJournal{"\xd9\xd5\x05\xf9\x20\xa1\x63\xd7", 8};
   std::error_code ignored;
   if (!fs::is_regular_file(file, ignored)) return false;
   std::string begin(kDatabase.size(), ' ');
   std::ifstream(file, std::ios::binary).read(begin.data(), static_cast<std::streamsize>(begin.size()));
-  return begin == kDatabase || begin.starts_with(kLog);
+  return begin == kDatabase || begin.starts_with(kLog) || begin.starts_with(kJournal);
 }
 
 }  // namespace
