@@ -163,6 +163,7 @@ TEST(SimulatorOptions, NumbersAreFiniteAndWithinTheirLimits) {
   EXPECT_EQ(parsed({"--seconds", "1e-3"})->seconds, 0.001);
   EXPECT_EQ(parsed({"--speed", "1000"})->speed, 1000);
   EXPECT_EQ(parsed({"--seed", "18446744073709551615"})->seed, UINT64_MAX);
+  EXPECT_EQ(parsed({"--history-days", "010"})->historyDays, 10) << "not octal";
 }
 
 /// What a console prints to standard output and to standard error.

@@ -3,6 +3,7 @@
 #include <QProcess>
 #include <QProcessEnvironment>
 #include <algorithm>
+#include <csignal>
 #include <cstdint>
 #include <filesystem>
 #include <fstream>
@@ -67,6 +68,13 @@ class SimulatorProgram : public ::testing::Test {
       process.waitForFinished(kLookMs);
     }
     return condition();
+  }
+  /// Whether the program has a handler for a signal by now.
+  bool catches(int signal) const {
+    std::ifstream status("/proc/" + std::to_string(process.processId()) + "/status");
+    for (std::string line; std::getline(status, line);)
+      if (line.starts_with("SigCgt:")) return (std::stoull(line.substr(7), nullptr, 16) >> (signal - 1) & 1U) != 0;
+    return false;
   }
   std::vector<std::string> documentNames() const {
     std::vector<std::string> names;
@@ -145,6 +153,29 @@ TEST_F(SimulatorProgram, RecordsIntoNoDatabase) {
   EXPECT_EQ(ended.code, 1);
   EXPECT_EQ(ended.errors, "quorl-simulator: " + database.string() + ": belongs to a database and is not overwritten\n");
   EXPECT_EQ(RawDatabase(database).column("PRAGMA integrity_check").at(0), "ok");
+}
+
+TEST_F(SimulatorProgram, RecordsIntoNoDatabaseThatItMakesItself) {
+  std::filesystem::create_directory(documents);
+  process.setWorkingDirectory(QString::fromStdString(documents.string()));
+  const Ended ended = run({"--seconds", "0.1", "--history-days", "1", "--record", database.filename().string()});
+  EXPECT_EQ(ended.code, 1);
+  EXPECT_THAT(ended.errors, HasSubstr("belongs to a database and is not overwritten\n"));
+  EXPECT_FALSE(std::filesystem::exists(database));
+}
+
+TEST_F(SimulatorProgram, StoresAllThatItWasDeliveredBeforeItEnds) {
+  const auto recording = directory.path() / "way.jsonl";
+  const Ended ended = run({"--history-days", "0", "--speed", "1000", "--seconds", "1", "--record", recording.string()});
+  EXPECT_EQ(ended.code, 0) << ended.errors;
+  const auto replayed = directory.path() / "replayed";
+  QProcess tool;
+  tool.start(QUORL_TOOL, {"replay", "--chipset", "mav20", "--documents", QString::fromStdString(replayed.string()),
+                          QString::fromStdString(recording.string())});
+  ASSERT_TRUE(tool.waitForFinished(kLongestRunMs));
+  ASSERT_EQ(tool.exitCode(), 0);
+  const std::string rows = "SELECT count(*) FROM Metric WHERE metric_tech <> 'RAT'";
+  EXPECT_EQ(single(rows), RawDatabase(replayed / "metricPartV11.sqlite").column(rows).at(0));
 }
 
 TEST_F(SimulatorProgram, ATypingMistakeIsToldInALine) {
@@ -238,9 +269,10 @@ TEST_F(SimulatorProgram, EndsWhileItWaitsForTheReaderOfItsRecording) {
   const auto pipe = directory.path() / "pipe";
   ASSERT_EQ(::mkfifo(pipe.c_str(), S_IRUSR | S_IWUSR), 0);
   start({"--history-days", "0", "--record", pipe.string()});
-  ASSERT_TRUE(waitsUntil([this] { return std::filesystem::exists(documents); }));
+  ASSERT_TRUE(waitsUntil([this] { return catches(SIGTERM); }));
   process.terminate();
   const Ended ended = end();
+  EXPECT_EQ(ended.code, 0);
   EXPECT_EQ(ended.errors, "");
   EXPECT_FALSE(std::filesystem::exists(database)) << "the product was not started";
 }

@@ -1,6 +1,7 @@
 #include "hosts/desktop/QuitOnSignal.h"
 
 #include <array>
+#include <cerrno>
 #include <csignal>
 #include <utility>
 
@@ -16,18 +17,22 @@ constexpr std::array kSignals{SIGINT, SIGTERM, SIGHUP};
 // A handler can use nothing but what the whole process has.
 std::array<int, 2> ends{-1, -1};
 
-void wake(int /*signal*/) {
-  const char byte = 0;
-  [[maybe_unused]] const ssize_t written = write(ends[1], &byte, 1);
-}
-
 void replaceHandler(int signal, void (*from)(int), void (*to)(int)) {
   struct sigaction action {};
   if (sigaction(signal, nullptr, &action) != 0 || action.sa_handler != from) return;
   action = {};
   action.sa_handler = to;
-  action.sa_flags = static_cast<int>(SA_RESETHAND | SA_RESTART);
+  action.sa_flags = SA_RESTART;
   sigaction(signal, &action, nullptr);
+}
+
+/// The next signal, whichever it is, finds the process as if there had been no handler.
+void wake(int /*signal*/) {
+  const int error = errno;
+  const char byte = 0;
+  [[maybe_unused]] const ssize_t written = write(ends[1], &byte, 1);
+  for (const int signal : kSignals) replaceHandler(signal, wake, SIG_DFL);
+  errno = error;
 }
 
 }  // namespace

@@ -70,7 +70,7 @@ void SimulatedDesktop::startRadio() {
   if (scenario_) scenario_->start();
 }
 
-tl::expected<void, std::string> SimulatedDesktop::stopRadio() {
+SimulatedDesktop::Ending SimulatedDesktop::stopRadio() {
   using Outcome = simulator::RecordingWriter::Outcome;
   played_.reset();
   // The modem tells from its own queue, and may do so after a rest that did not come.
@@ -82,16 +82,31 @@ tl::expected<void, std::string> SimulatedDesktop::stopRadio() {
   } else {
     ended->set_value({});
   }
-  comeToRest();
-  if (outcome.wait_for(std::chrono::seconds(0)) != std::future_status::ready)
-    return tl::unexpected(std::string("not ended in time"));
-  return outcome.get();
+  const bool isAtRest = workOff();
+  const bool isTold = outcome.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
+  return {isTold ? outcome.get() : tl::unexpected(std::string("not ended in time")), isAtRest};
 }
 
 void SimulatedDesktop::comeToRest() const {
   const auto end = std::chrono::steady_clock::now() + kLongestRest;
   while (!activity_->isAtRest() && std::chrono::steady_clock::now() < end)
     QCoreApplication::processEvents(QEventLoop::AllEvents, 10);
+}
+
+/// Gives up when the tasks have not become fewer for a while.
+bool SimulatedDesktop::workOff() const {
+  std::size_t fewest = activity_->count();
+  auto end = std::chrono::steady_clock::now() + kLongestRest;
+  while (!activity_->isAtRest()) {
+    QCoreApplication::processEvents(QEventLoop::AllEvents, 10);
+    const auto now = std::chrono::steady_clock::now();
+    if (const std::size_t count = activity_->count(); count < fewest) {
+      fewest = count;
+      end = now + kLongestRest;
+    }
+    if (now >= end) return activity_->isAtRest();
+  }
+  return true;
 }
 
 void SimulatedDesktop::deliver(const simulator::RecordedEvent& event) {

@@ -42,8 +42,12 @@ class SimulatedDesktop {
   tl::expected<void, std::string> tuneIn(Programme programme);
   /// Lets the programme go on with the time of day.
   void startRadio();
-  /// Ends it. The error says why its recording is not whole.
-  tl::expected<void, std::string> stopRadio();
+  struct Ending {
+    tl::expected<void, std::string> recording;  // the error says why it is not whole; none without a recording
+    bool isAtRest = true;                       // all that was delivered is worked off
+  };
+  /// Ends it, and runs the event loop for as long as what was delivered is being worked off.
+  Ending stopRadio();
   /// Runs the event loop until the phone has come to rest, for two seconds at most.
   void comeToRest() const;
 
@@ -54,6 +58,8 @@ class SimulatedDesktop {
   bool isAtRest() const { return activity_->isAtRest(); }
 
  private:
+  bool workOff() const;
+
   const std::shared_ptr<simulator::Activity> activity_;
   simulator::TrackedQueueFactory queues_;
   simulator::TrackedQueue mainQueue_;

@@ -30,6 +30,11 @@ constexpr char kUsualScenario[] = "city";
 constexpr double kShortestRun = 0.001;
 constexpr double kLongestRun = 1e9;
 
+/// Whole numbers with both limits included; `range` is for the help.
+CLI::Validator within(std::uint64_t least, std::uint64_t most, std::string range) {
+  return {[=](std::string& text) { return simulator::wholeNumberFault(text, least, most); }, std::move(range)};
+}
+
 std::vector<std::filesystem::path> resources() {
   return simulator::ResourceDirectories::ofThisProgram(QUORL_RESOURCE_DIRECTORY);
 }
@@ -136,14 +141,13 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
   app.add_flag("--carrier-build", options.device.isCarrierBuild, "Be a carrier build");
   app.add_option("--device-class", deviceClass, "Device class; Tabrin is a tablet");
   app.add_option("--sims", options.sims, "How many SIMs the phone has at most; as many as the scenario if not given")
-      ->check(CLI::Range(0, 2));
+      ->transform(within(0, 2, "0 TO 2"));
   app.add_option("--scenario", options.scenario,
                  fmt::format("Scenario to go through: {}, or a file; the usual one is {}",
                              joined(simulator::scenarioNames(resources()), ", "), kUsualScenario))
       ->check(CLI::Validator(faultOfScenario, ""));
   app.add_option("--seed", options.seed, "Which of the scenario's runs")
-      ->transform(CLI::Validator([](std::string& text) { return simulator::wholeNumberFault(text, 0, UINT64_MAX); },
-                                 "0 OR MORE"))
+      ->transform(within(0, UINT64_MAX, "0 OR MORE"))
       ->capture_default_str();
   auto* recording =
       app.add_option("--recording", options.recording, "Recording to play over and over in place of a scenario")
@@ -155,7 +159,7 @@ tl::expected<SimulatorOptions, int> SimulatorOptions::parse(int argc, char** arg
       ->check(CLI::ExistingFile);
   app.add_option("--record", options.record, "Write what the scenario delivers to this recording")->excludes(recording);
   app.add_option("--history-days", options.historyDays, "Days of history that the phone has before its first start")
-      ->check(CLI::Range(0, 31))
+      ->transform(within(0, 31, "0 TO 31"))
       ->capture_default_str();
   app.add_option("--speed", options.speed, "How many times as fast as life everything goes")
       ->check([](const std::string& text) { return simulator::numberFault(text, 0.01, 1000); }, "0.01 TO 1000")

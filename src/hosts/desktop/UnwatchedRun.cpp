@@ -56,8 +56,8 @@ UnwatchedRun::UnwatchedRun(QQuickWindow& window, view::ShellBinding& shell, Base
 }
 
 void UnwatchedRun::printChanges() {
-  print();
   printing_.start(kLook);
+  print();
 }
 
 void UnwatchedRun::print() {

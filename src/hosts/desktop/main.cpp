@@ -100,9 +100,13 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
   const auto made = makeHistory(options, *programme, quitting);
   if (quitting.isAsked()) return EXIT_SUCCESS;
   if (!made) return fail(made.error());
-  const auto reader = desktop::awaitReader(options.record, quitting);
+  auto reader = desktop::awaitReader(options.record, quitting);
   if (quitting.isAsked()) return EXIT_SUCCESS;
+  // Once more, as there may be a database now.
+  if (const auto spared = simulator::spareDatabase(options.record, options.documents); !spared)
+    return fail(spared.error());
   if (const auto ready = phone->tuneIn(*std::move(programme)); !ready) return fail(ready.error());
+  reader = simulator::Descriptor();
   static auto* product = new AppDelegate;
   desktop::Lifecycle lifecycle(*product);
   lifecycle.launch();
@@ -132,9 +136,10 @@ int run(QGuiApplication& application, const SimulatorOptions& options) {
   }
   const int code = application.exec();
   lifecycle.terminate();
-  if (const auto whole = phone->stopRadio(); !whole && !options.record.empty())
-    return fail(options.record.string() + ": " + whole.error());
-  return unwatched.hasFailed() ? EXIT_FAILURE : code;
+  const auto radio = phone->stopRadio();
+  if (!radio.isAtRest) desktop::tell("the last rows are not stored: it takes too long");
+  if (!radio.recording) desktop::tell(options.record.string() + ": " + radio.recording.error());
+  return radio.isAtRest && radio.recording && !unwatched.hasFailed() ? code : EXIT_FAILURE;
 }
 
 }  // namespace
@@ -143,7 +148,10 @@ int main(int argc, char** argv) {
   fillStandardFiles();
   QCoreApplication::setApplicationName("quorl-simulator");
   const auto options = SimulatorOptions::parse(argc, argv);
-  if (!options) return options.error();
+  if (!options) {
+    std::cout.flush();
+    return std::cout ? options.error() : fail("standard output cannot be written");
+  }
   std::shared_ptr<LogSink> shownLog;
   if (options->isVerbose)
     shownLog = std::make_shared<SpdlogSink>(log_category::kFallbackSubsystem,

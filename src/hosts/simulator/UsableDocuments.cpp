@@ -51,8 +51,9 @@ tl::expected<void, std::string> tryReading(const fs::path& file) {
 bool isSameFile(const fs::path& one, const fs::path& other) {
   std::error_code error;
   if (fs::equivalent(one, other, error)) return true;
-  const fs::path first = fs::weakly_canonical(one, error);
-  return !error && first == fs::weakly_canonical(other, error) && !error;
+  // Of a relative path whose file is missing, the canonical one would be relative as well.
+  const auto whole = [&error](const fs::path& path) { return fs::weakly_canonical(fs::absolute(path, error), error); };
+  return !one.empty() && whole(one) == whole(other) && !error;
 }
 
 /// Whether a file that is there begins as a database, or the log or journal of one, does.

@@ -52,7 +52,12 @@ int moveWithoutReplacing(const fs::path& from, const fs::path& to) {
   if (::renameat2(AT_FDCWD, from.c_str(), AT_FDCWD, to.c_str(), RENAME_NOREPLACE) == 0) return 0;
   // Not every file system knows how.
   if (errno != EINVAL && errno != ENOSYS) return errno;
-  return ::link(from.c_str(), to.c_str()) == 0 ? 0 : errno;
+  if (::link(from.c_str(), to.c_str()) == 0) return 0;
+  if (errno != EPERM && errno != EOPNOTSUPP && errno != ENOSYS) return errno;
+  std::error_code error;
+  if (fs::exists(to, error)) return EEXIST;
+  fs::rename(from, to, error);
+  return error.value();
 }
 
 }  // namespace
