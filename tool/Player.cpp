@@ -15,7 +15,8 @@ using simulator::TelephonyScriptStep;
 
 namespace {
 
-std::chrono::milliseconds milliseconds(std::uint64_t count) {
+/// The longest time there is, if that many milliseconds are more.
+std::chrono::milliseconds clamped(std::uint64_t count) {
   using Count = std::chrono::milliseconds::rep;
   return std::chrono::milliseconds(std::in_range<Count>(count) ? static_cast<Count>(count)
                                                                : std::numeric_limits<Count>::max());
@@ -52,7 +53,7 @@ bool Player::play(const std::vector<RecordedEvent>& events) {
   constexpr std::size_t kPortion = 256;
   bool isTaken = true;
   for (std::size_t at = 0; at < events.size(); ++at) {
-    if (events[at].atMs) goTo(milliseconds(*events[at].atMs));
+    if (events[at].atMs) goTo(clamped(*events[at].atMs));
     isTaken = phone_.baseband().deliver(zelkor::kEventMetric, events[at].message()) && isTaken;
     if (at % kPortion == kPortion - 1) phone_.runUntilAtRest();
   }
