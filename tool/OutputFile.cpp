@@ -1,14 +1,15 @@
 #include "OutputFile.h"
 
 #include <cerrno>
-#include <cstdio>
-#include <cstdlib>
 #include <optional>
 #include <system_error>
+#include <utility>
 
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
+
+#include "base/PartFile.h"
 
 namespace quorl::tool {
 
@@ -16,26 +17,12 @@ namespace fs = std::filesystem;
 
 namespace {
 
-bool writeAll(int file, std::string_view text) {
-  while (!text.empty()) {
-    const ssize_t written = write(file, text.data(), text.size());
-    if (written < 0 && errno == EINTR) continue;
-    if (written < 0) return false;
-    text.remove_prefix(static_cast<std::size_t>(written));
-  }
-  return true;
-}
-
-/// Writes and closes. Answers the error, 0 if there is none.
-int fill(int file, std::string_view text) {
-  int error = writeAll(file, text) ? 0 : errno;
-  if (close(file) != 0 && error == 0) error = errno;
-  return error;
-}
-
 int writeInPlace(const fs::path& file, std::string_view text) {
   const int opened = open(file.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0600);
-  return opened < 0 ? errno : fill(opened, text);
+  if (opened < 0) return errno;
+  int error = writeAll(opened, text) ? 0 : errno;
+  if (close(opened) != 0 && error == 0) error = errno;
+  return error;
 }
 
 /// The file that can be replaced by another, behind all links; none for devices, pipes, and what may not be written.
@@ -64,17 +51,16 @@ bool isForbidden(int error) {
 
 /// Nothing if there is no right to have a file beside it that then takes its place.
 std::optional<int> writeBeside(const fs::path& file, std::string_view text) {
-  std::string beside = (file.parent_path() / ".quorl-XXXXXX").string();
-  const int opened = mkostemp(beside.data(), O_CLOEXEC);
-  if (opened < 0) return isForbidden(errno) ? std::nullopt : std::optional(errno);
-  const bool isAlike = takesAfter(opened, file);
-  const int error = fill(opened, text);
-  const int moved = error != 0 || !isAlike || std::rename(beside.c_str(), file.c_str()) == 0 ? 0 : errno;
-  if (error == 0 && isAlike && moved == 0) return 0;
-  unlink(beside.c_str());
-  if (error != 0) return error;
-  const bool isFixed = moved == EBUSY || moved == EXDEV;  // as where another file system is mounted on it
-  return !isAlike || isFixed || isForbidden(moved) ? std::nullopt : std::optional(moved);
+  PartFile part(file);
+  if (part.error() != 0) return isForbidden(part.error()) ? std::nullopt : std::optional(part.error());
+  const bool isAlike = takesAfter(part.descriptor(), file);
+  part.write(text);
+  part.close();
+  if (part.error() != 0) return part.error();
+  if (!isAlike) return std::nullopt;
+  part.moveTo(file, /*replacing=*/true);
+  const bool isFixed = part.error() == EBUSY || part.error() == EXDEV;  // as where a file system is mounted on it
+  return isFixed || isForbidden(part.error()) ? std::nullopt : std::optional(part.error());
 }
 
 }  // namespace

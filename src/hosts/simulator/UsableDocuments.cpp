@@ -1,7 +1,6 @@
 #include "hosts/simulator/UsableDocuments.h"
 
 #include <cerrno>
-#include <cstdlib>
 #include <fstream>
 #include <memory>
 #include <string_view>
@@ -9,9 +8,8 @@
 
 #include <fmt/format.h>
 #include <sqlite3.h>
-#include <unistd.h>
 
-#include "hosts/simulator/Descriptor.h"
+#include "base/PartFile.h"
 #include "hosts/simulator/PhoneServices.h"
 
 namespace quorl::simulator {
@@ -28,10 +26,8 @@ tl::unexpected<std::string> unusable(const fs::path& path, std::string_view why)
 
 /// Permissions alone do not tell whether a file can be made.
 tl::expected<void, std::string> tryWriting(const fs::path& directory) {
-  std::string probe = (directory / ".quorl-XXXXXX").string();
-  const Descriptor file(::mkstemp(probe.data()));
-  if (!file.isOpen()) return unusable(directory, std::generic_category().message(errno));
-  ::unlink(probe.c_str());
+  const PartFile probe(databaseFile(directory));
+  if (probe.error() != 0) return unusable(directory, std::generic_category().message(probe.error()));
   return {};
 }
 
